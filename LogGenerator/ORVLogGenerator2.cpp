@@ -1,0 +1,198 @@
+#include "LogGenerator/ORVLogGenerator2.h"
+
+#include <charconv>
+
+#include "LogGenerator/StateKeys.h"
+#include "core/platform/Resources.h"
+#include "core/platform/SystemLog.h"
+#include "core/platform/plist/PlistCodec.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr std::size_t kMinimumBlobLength = 13;
+constexpr std::uint8_t kChannelPrefixMarker = 0x81;
+constexpr std::size_t kChannelPrefixLength = 2;
+constexpr std::uint8_t kPlainLogType = 1;
+constexpr std::uint8_t kExtendedLogType = 0xFF;
+constexpr std::int32_t kExtendedCodeBase = 0xFF0000;
+
+}  // namespace
+
+ORVLogGenerator2::Announcement ORVLogGenerator2::announce(const char* creationLine) {
+    SystemLog::log(kLogError, "%s", creationLine);
+    return {};
+}
+
+ORVLogGenerator2::CreationNoted ORVLogGenerator2::noteCreation(const ClassIndex* classIndex) {
+    SystemLog::log(kLogError, "Creating ORVLogGenerator2 object with %p", static_cast<const void*>(classIndex));
+    return {};
+}
+
+ORVLogGenerator2::ORVLogGenerator2(CreationNoted, std::string templateName, std::shared_ptr<ClassIndex> classIndex)
+    : pListName(std::move(templateName)), cIndex(std::move(classIndex)) {
+    SystemLog::log(kLogError, "Class Index: %ld", static_cast<long>(cIndex.use_count()));
+}
+
+ORVLogGenerator2::ORVLogGenerator2(std::string templateName, std::shared_ptr<ClassIndex> classIndex)
+    : ORVLogGenerator2{noteCreation(classIndex.get()), std::move(templateName), std::move(classIndex)} {}
+
+ORVLogGenerator2::ORVLogGenerator2(Announcement, std::string templateName, std::shared_ptr<ClassIndex> classIndex)
+    : ORVLogGenerator2(std::move(templateName), std::move(classIndex)) {}
+
+ORVLogGenerator2::~ORVLogGenerator2() {
+    // The text names the GSM generator whatever the concrete class; it is fixed on purpose.
+    SystemLog::log(kLogWarning, "ORV_GSMLogGenerator is destructed %p", static_cast<void*>(this));
+}
+
+void ORVLogGenerator2::updateState(const StateDict& state, ByteView data) {
+    getDisplayFromState(state);
+    updateWithData(data);
+    if (_binData) {
+        _binData->insert(_binData->end(), data.begin(), data.end());
+    }
+}
+
+void ORVLogGenerator2::updateWithData(ByteView data) {
+    // The length test is made before the prefix is cut, so a prefixed blob of 13 or 14 bytes passes.
+    if (data.size() < kMinimumBlobLength) {
+        return;
+    }
+    const ByteView packet = data[0] == kChannelPrefixMarker ? data.subspan(kChannelPrefixLength) : data;
+    const std::uint8_t logType = packet[0];
+    if (logType != kPlainLogType && logType != kExtendedLogType) {
+        SystemLog::log(kLogError, "Invalid log type: %x. Dropping.", logType);
+        return;
+    }
+    std::int32_t code = static_cast<std::int32_t>(packet[3] | (packet[4] << 8));
+    if (logType == kExtendedLogType) {
+        code |= kExtendedCodeBase;
+    }
+    if (!cIndex) {
+        return;
+    }
+    if (const DecoderList* subscribers = cIndex->getSubscribers(code)) {
+        for (const DecoderRef& decoder : *subscribers) {
+            decoder->updateWithData(packet, code);
+        }
+    }
+}
+
+PlistValue ORVLogGenerator2::getDisplayFromState(const StateDict& state) {
+    if (const PlistValue* display = state->find(state_keys::kDisplay); display && !display->isNone()) {
+        return *display;
+    }
+    PlistValue templateValue = state->get(state_keys::kTemplate);
+    if (templateValue.isNone()) {
+        const auto path = Resources::pathForResource(pListName, "plist");
+        std::optional<PlistValue> loaded = path ? readDictionaryFile(*path) : std::nullopt;
+        if (!loaded) {
+            SystemLog::log(kLogError, "Cannot load template for display");
+            return PlistValue();
+        }
+        templateValue = *loaded;
+        state->set(state_keys::kTemplate, templateValue);
+    }
+    SystemLog::log(kLogWarning, "Initialized class index: %p, Self: %p", static_cast<const void*>(cIndex.get()),
+                   static_cast<void*>(this));
+    if (cIndex) {
+        cIndex->status();
+    }
+    PlistValue tree = processTemplate(templateValue);
+    printDict(tree);
+    if (!tree.isNone()) {
+        state->set(state_keys::kDisplay, tree);
+        state->set(state_keys::kExtraInfo, PlistValue::newDictionary());
+    }
+    // The call that builds the tree answers null, as the value found at the start was null.
+    return PlistValue();
+}
+
+PlistValue ORVLogGenerator2::processTemplate(const PlistValue& templateValue) {
+    if (const std::string* text = templateValue.string()) {
+        return PlistValue(*text);
+    }
+    if (const PlistDictionaryRef& dictionary = templateValue.dictionary()) {
+        auto processed = PlistDictionary::create();
+        processed->reserve(dictionary->size());
+        for (const auto& [key, value] : *dictionary) {
+            PlistValue child = processTemplate(value);
+            if (child.isNone()) {
+                return PlistValue();  // a value of an unsupported type: the tree cannot be built
+            }
+            if (Base* decoder = cIndex ? cIndex->getClass(key) : nullptr) {
+                decoder->updateSectionRef(child);
+            }
+            processed->set(key, std::move(child));
+        }
+        return PlistValue(std::move(processed));
+    }
+    if (const PlistArrayRef& array = templateValue.array()) {
+        auto processed = PlistArray::create();
+        processed->reserve(array->size());
+        for (const PlistValue& element : *array) {
+            PlistValue child = processTemplate(element);
+            if (child.isNone()) {
+                return PlistValue();
+            }
+            processed->append(std::move(child));
+        }
+        return PlistValue(std::move(processed));
+    }
+    SystemLog::log(kLogError, "Received an object of unknown type");
+    SystemLog::log(kLogWarning, "Processing the template");
+    return PlistValue();
+}
+
+void ORVLogGenerator2::printDict(const PlistValue& displayValue) {
+    if (displayValue.isString()) {
+        return;
+    }
+    if (const PlistDictionaryRef& dictionary = displayValue.dictionary()) {
+        for (const auto& entry : *dictionary) {
+            printDict(entry.second);
+        }
+        return;
+    }
+    if (const PlistArrayRef& array = displayValue.array()) {
+        for (const PlistValue& element : *array) {
+            printDict(element);
+        }
+        return;
+    }
+    SystemLog::log(kLogError, "Received an object of unknown type");
+}
+
+PlistValue ORVLogGenerator2::generateLogUsingState(const StateDict& state) {
+    PlistValue display = getDisplayFromState(state);
+    if (_binData) {
+        state->set(state_keys::kDisplayState, PlistValue(takeBinData()));
+    }
+    LogGenerator::updateHistoryInState(state);
+    return display;
+}
+
+PlistValue ORVLogGenerator2::getStartCommand() {
+    const std::vector<std::string> codes = cIndex ? cIndex->getAllLogCodes() : std::vector<std::string>();
+    auto plainCodes = PlistArray::create();
+    auto extraCodes = PlistArray::create();
+    plainCodes->reserve(codes.size());
+    extraCodes->reserve(codes.size());
+    for (const std::string& text : codes) {
+        std::int64_t code = 0;
+        std::from_chars(text.data(), text.data() + text.size(), code);
+        if (code >= kExtendedCodeBase) {
+            extraCodes->append(PlistValue::integer(code - kExtendedCodeBase));
+        } else {
+            plainCodes->append(PlistValue::integer(code));
+        }
+    }
+    auto command = PlistDictionary::create();
+    command->set("SetState", "Streaming");
+    command->set("SetOrvaneLogCodes", std::move(plainCodes));
+    command->set("SetKxExtraCodes", std::move(extraCodes));
+    return command;
+}
+
+}  // namespace velmar

@@ -1,0 +1,57 @@
+// ORVLogGenerator2: the log-code generator. It frames each blob, dispatches the packet by log code to the
+// record decoders of its class index, and shows a display tree built from its technology's template.
+//
+// Contract (intake): a blob under 13 bytes is ignored; a leading 0x81 marks a two-byte channel prefix that
+// is cut off; the log type (1 plain, 255 extended) and the 16-bit code pick the 32-bit dispatch code (the
+// extended one with 0xFF0000 added); every subscriber receives the same read-only packet, in registration
+// order. Every blob, whatever happened to it, is appended to _binData.
+// Contract (display): the first getDisplayFromState loads the template, builds a mutable copy of it under
+// "Display", binds each decoder to the container under its section name, and returns null; later calls
+// return that tree. generateLogUsingState moves the blobs of the interval under "DisplayState" and appends
+// a history entry. The start command lists the plain and the extra codes of the class index.
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include "LogGenerator/ClassIndex.h"
+#include "LogGenerator/ORVLogGenerator.h"
+
+namespace velmar {
+
+class ORVLogGenerator2 : public ORVLogGenerator {
+public:
+    ~ORVLogGenerator2() override;
+
+    void updateState(const StateDict& state, ByteView data) override;
+    void updateWithData(ByteView data);
+    PlistValue getDisplayFromState(const StateDict& state);
+    PlistValue processTemplate(const PlistValue& templateValue);
+    void printDict(const PlistValue& displayValue);
+    PlistValue generateLogUsingState(const StateDict& state) override;
+    PlistValue getStartCommand() override;
+
+    const ClassIndex* classIndex() const { return cIndex.get(); }
+    const std::string& templateName() const { return pListName; }
+
+protected:
+    // The result of a subclass's creation line, logged before any base initialisation runs.
+    struct Announcement {};
+    static Announcement announce(const char* creationLine);
+
+    // initWithPListName:cIndexObj: takes ownership of the template name and the class index.
+    ORVLogGenerator2(std::string templateName, std::shared_ptr<ClassIndex> classIndex);
+    ORVLogGenerator2(Announcement, std::string templateName, std::shared_ptr<ClassIndex> classIndex);
+    // An object on which no base initialisation ran: no class index, no template name, no _binData.
+    explicit ORVLogGenerator2(Uninitialized tag) : ORVLogGenerator(tag) {}
+
+    std::string pListName;
+    std::shared_ptr<ClassIndex> cIndex;
+
+private:
+    struct CreationNoted {};
+    static CreationNoted noteCreation(const ClassIndex* classIndex);
+    ORVLogGenerator2(CreationNoted, std::string templateName, std::shared_ptr<ClassIndex> classIndex);
+};
+
+}  // namespace velmar

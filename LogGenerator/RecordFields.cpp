@@ -1,0 +1,83 @@
+#include "LogGenerator/RecordFields.h"
+
+#include <cstdio>
+
+namespace velmar {
+
+namespace {
+
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wformat-nonliteral"
+template <typename Argument>
+std::string formatOne(const char* format, Argument argument) {
+    char text[128];
+    const int length = std::snprintf(text, sizeof text, format, argument);
+    if (length < 0) {
+        return std::string();
+    }
+    return std::string(text, static_cast<std::size_t>(length) < sizeof text ? static_cast<std::size_t>(length)
+                                                                            : sizeof text - 1);
+}
+#pragma GCC diagnostic pop
+
+}  // namespace
+
+std::string ValueNames::nameOf(std::int64_t raw) const {
+    if (const char* name = find(raw)) {
+        return name;
+    }
+    return formatOne(otherwiseFormat, static_cast<int>(raw));
+}
+
+std::string ValueFormat::render(std::int64_t raw) const {
+    if (hasSentinel && raw == sentinel) {
+        return sentinelText;
+    }
+    switch (kind) {
+        case Kind::Int:
+            return formatOne(format, static_cast<int>(raw * multiplier + addend));
+        case Kind::Unsigned:
+            return formatOne(format, static_cast<unsigned>(raw * multiplier + addend));
+        case Kind::Long:
+            return formatOne(format, static_cast<long>(raw * multiplier + addend));
+        case Kind::Double:
+            return formatOne(format, static_cast<double>(raw) * scale + bias);
+        case Kind::Names:
+            return names->nameOf(raw);
+    }
+    return std::string();
+}
+
+std::int64_t RecordField::read(const RecordReader& record, std::size_t base) const {
+    const std::size_t at = base + offset;
+    switch (encoding) {
+        case FieldEncoding::LittleUnsigned:
+            return static_cast<std::int64_t>(record.unsignedLE(at, width));
+        case FieldEncoding::LittleSigned:
+            return record.signedLE(at, width);
+        case FieldEncoding::BigUnsigned:
+            return static_cast<std::int64_t>(record.unsignedBE(at, width));
+        case FieldEncoding::BigSigned:
+            return record.signedBE(at, width);
+        case FieldEncoding::Bits:
+            return record.bits(at, width, lowBit, highBit);
+    }
+    return 0;
+}
+
+void writeFields(std::span<const RecordField> fields, const RecordReader& record, std::size_t base,
+                 PlistDictionary& dictionary) {
+    for (const RecordField& field : fields) {
+        dictionary.set(field.key, field.format.render(field.read(record, base)));
+    }
+}
+
+PlistDictionaryRef rowFromFields(std::span<const RecordField> fields, const RecordReader& record,
+                                 std::size_t base) {
+    auto row = PlistDictionary::create();
+    row->reserve(fields.size());
+    writeFields(fields, record, base, *row);
+    return row;
+}
+
+}  // namespace velmar

@@ -1,0 +1,70 @@
+# Velmar: set-up, build, test and demo entry points. Every target installs what it needs first.
+SHELL := /bin/bash
+.DEFAULT_GOAL := build
+
+# The Debian packages the project builds and tests with.
+DEBIAN_PACKAGES := build-essential cmake pkg-config clang libclang-rt-14-dev qt6-base-dev libexpat1-dev \
+                   libncurses-dev googletest libgtest-dev libbenchmark-dev tmux
+SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
+FUZZ_SECONDS ?= 60
+DEMO_TECHNOLOGY ?= lte
+DEMO_CAPTURE ?= samples/captures/lte-connected-1.qmdl
+
+.PHONY: deps build build-asan build-fuzz test test-default test-asan fuzz bench demo format clean
+
+deps:
+	@missing=""; \
+	for package in $(DEBIAN_PACKAGES); do \
+	  dpkg-query -W -f='$${Status}' "$$package" 2>/dev/null | grep -q "install ok installed" || missing="$$missing $$package"; \
+	done; \
+	if [ -n "$$missing" ]; then \
+	  echo "Installing:$$missing"; \
+	  $(SUDO) apt-get update -qq && \
+	  DEBIAN_FRONTEND=noninteractive $(SUDO) apt-get install -y -qq --no-install-recommends $$missing >/dev/null; \
+	fi
+
+build: deps
+	cmake --preset default >/dev/null
+	cmake --build --preset default
+
+build-asan: deps
+	cmake --preset asan >/dev/null
+	cmake --build --preset asan
+
+build-fuzz: deps
+	cmake --preset fuzz >/dev/null
+	cmake --build --preset fuzz
+
+test-default: build
+	ctest --preset default
+
+test-asan: build-asan
+	ctest --preset asan
+
+# Each fuzz target runs for FUZZ_SECONDS from its committed seed corpus; new inputs go to a scratch copy.
+fuzz: build-fuzz
+	@for target in build/fuzz/fuzz/fuzz_*; do \
+	  [ -x "$$target" ] || continue; \
+	  name=$$(basename "$$target"); scratch=$$(mktemp -d); log=$$(mktemp); \
+	  echo "== $$name: $(FUZZ_SECONDS) s"; \
+	  "$$target" -max_total_time=$(FUZZ_SECONDS) -print_final_stats=1 "$$scratch" "fuzz/corpus/$$name" >"$$log" 2>&1; \
+	  status=$$?; \
+	  grep -E "^(stat::number_of_executed_units|stat::peak_rss_mb|SUMMARY)|ERROR" "$$log" || true; \
+	  if [ "$$status" != 0 ]; then tail -40 "$$log"; rm -rf "$$scratch" "$$log"; echo "$$name failed"; exit 1; fi; \
+	  rm -rf "$$scratch" "$$log"; \
+	done
+
+test: test-default test-asan fuzz
+
+bench: build
+	@for program in build/default/bench/bench_*; do [ -x "$$program" ] && "$$program"; done
+
+demo: build
+	./build/default/tools/velmar-decode --technology $(DEMO_TECHNOLOGY) $(DEMO_CAPTURE)
+
+format:
+	find core LogGenerator logfile tools tests bench fuzz ui service -name '*.cpp' -o -name '*.h' 2>/dev/null \
+	  | xargs clang-format -i
+
+clean:
+	rm -rf build

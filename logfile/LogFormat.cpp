@@ -1,0 +1,187 @@
+#include "logfile/LogFormat.h"
+
+#include <algorithm>
+#include <array>
+#include <cctype>
+#include <cstring>
+
+#include "logfile/DiagCapture.h"
+#include "logfile/DlfFile.h"
+#include "logfile/HexBlobFile.h"
+#include "logfile/SnapshotFile.h"
+
+namespace velmar {
+
+namespace {
+
+struct FormatName {
+    LogFormat format;
+    std::string_view name;
+    std::string_view extension;
+};
+
+constexpr std::array<FormatName, 5> kFormats = {{
+    {LogFormat::Auto, "auto", ""},
+    {LogFormat::Hex, "hex", ".hex"},
+    {LogFormat::Dlf, "dlf", ".dlf"},
+    {LogFormat::DiagCapture, "qmdl", ".qmdl"},
+    {LogFormat::Snapshot, "velmar", ".velmar"},
+}};
+
+bool startsWith(std::span<const std::uint8_t> bytes, std::string_view prefix) {
+    return bytes.size() >= prefix.size() && std::memcmp(bytes.data(), prefix.data(), prefix.size()) == 0;
+}
+
+bool isSpace(std::uint8_t byte) {
+    return byte == ' ' || byte == '\t' || byte == '\r' || byte == '\n';
+}
+
+// Text as a hex blob file holds it: no control characters other than blanks and line ends.
+bool looksLikeText(std::span<const std::uint8_t> bytes) {
+    return std::all_of(bytes.begin(), bytes.end(), [](std::uint8_t byte) {
+        return byte >= 0x20 ? byte != 0x7F : (isSpace(byte) || byte == '\v' || byte == '\f');
+    });
+}
+
+// True when one of the first few 0x7E-terminated frames, unescaped, ends with its correct CRC.
+bool looksLikeDiagCapture(std::span<const std::uint8_t> bytes) {
+    constexpr int kFramesToTry = 8;
+    PlistData frame;
+    std::size_t start = 0;
+    int tried = 0;
+    for (std::size_t index = 0; index < bytes.size() && tried < kFramesToTry; ++index) {
+        if (bytes[index] != kDiagFrameEnd) {
+            continue;
+        }
+        frame.clear();
+        bool dangling = false;
+        for (std::size_t i = start; i < index; ++i) {
+            if (bytes[i] != kDiagEscape) {
+                frame.push_back(bytes[i]);
+            } else if (i + 1 < index) {
+                frame.push_back(bytes[++i] ^ kDiagEscapeXor);
+            } else {
+                dangling = true;
+            }
+        }
+        start = index + 1;
+        if (frame.empty()) {
+            continue;
+        }
+        ++tried;
+        if (!dangling && frame.size() >= 3) {
+            const std::size_t body = frame.size() - 2;
+            const unsigned sent = frame[body] | static_cast<unsigned>(frame[body + 1]) << 8;
+            if (crc16X25(std::span(frame.data(), body)) == sent) {
+                return true;
+            }
+        }
+    }
+    return false;
+}
+
+}  // namespace
+
+std::string_view logFormatName(LogFormat format) {
+    for (const FormatName& entry : kFormats) {
+        if (entry.format == format) {
+            return entry.name;
+        }
+    }
+    return "unknown";
+}
+
+std::optional<LogFormat> parseLogFormatName(std::string_view name) {
+    for (const FormatName& entry : kFormats) {
+        if (entry.name == name) {
+            return entry.format;
+        }
+    }
+    return std::nullopt;
+}
+
+std::optional<LogFormat> logFormatForExtension(std::string_view path) {
+    const std::size_t slash = path.find_last_of('/');
+    const std::string_view file = slash == std::string_view::npos ? path : path.substr(slash + 1);
+    const std::size_t dot = file.find_last_of('.');
+    if (dot == std::string_view::npos || dot == 0) {
+        return std::nullopt;
+    }
+    std::string extension(file.substr(dot));
+    std::transform(extension.begin(), extension.end(), extension.begin(),
+                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+    for (const FormatName& entry : kFormats) {
+        if (!entry.extension.empty() && entry.extension == extension) {
+            return entry.format;
+        }
+    }
+    return std::nullopt;
+}
+
+LogFormat logFormatForContent(std::span<const std::uint8_t> head) {
+    if (startsWith(head, "bplist00")) {
+        return LogFormat::Snapshot;
+    }
+    std::span<const std::uint8_t> text = head;
+    if (startsWith(text, "\xEF\xBB\xBF")) {
+        text = text.subspan(3);
+    }
+    while (!text.empty() && isSpace(text.front())) {
+        text = text.subspan(1);
+    }
+    if (startsWith(text, "<?xml") || startsWith(text, "<plist") || startsWith(text, "<!DOCTYPE plist")) {
+        return LogFormat::Snapshot;
+    }
+    if (!text.empty() && looksLikeText(head) &&
+        (std::isxdigit(text.front()) != 0 || text.front() == '#' || startsWith(text, "tick"))) {
+        return LogFormat::Hex;
+    }
+    if (looksLikeDiagCapture(head)) {
+        return LogFormat::DiagCapture;
+    }
+    return LogFormat::Dlf;
+}
+
+std::optional<LogFormat> detectLogFormat(const std::string& path, std::string& error) {
+    if (const std::optional<LogFormat> format = logFormatForExtension(path)) {
+        return format;
+    }
+    PlistData head;
+    if (!readFileBytes(path, head, error, kLogFormatProbeSize)) {
+        return std::nullopt;
+    }
+    return logFormatForContent(head);
+}
+
+bool forEachLogItem(const std::string& path, LogFormat format, const LogItemCallback& callback,
+                    std::string& error, LogReadStats* stats) {
+    if (format == LogFormat::Auto) {
+        const std::optional<LogFormat> detected = detectLogFormat(path, error);
+        if (!detected) {
+            return false;
+        }
+        format = *detected;
+    }
+    switch (format) {
+        case LogFormat::Hex:
+            return forEachHexBlobItem(path, callback, error, stats);
+        case LogFormat::Dlf:
+            return forEachDlfItem(path, callback, error, stats);
+        case LogFormat::DiagCapture:
+            return forEachDiagCaptureItem(path, callback, error, stats);
+        case LogFormat::Snapshot:
+            return forEachSnapshotItem(path, callback, error, stats);
+        case LogFormat::Auto:
+            break;
+    }
+    error = path + ": no reader for this format";
+    return false;
+}
+
+LogReadResult readLogFile(const std::string& path, LogFormat format) {
+    return collectLogItems([&](const LogItemCallback& callback, std::string& error, LogReadStats* stats) {
+        return forEachLogItem(path, format, callback, error, stats);
+    });
+}
+
+}  // namespace velmar

@@ -1,0 +1,40 @@
+// SnapshotFile: replaying the blobs kept in a saved snapshot (.velmar).
+//
+// A snapshot is a property-list dictionary {"Timestamp", "Data", "Description"}; "Data" is an array of
+// dictionaries. A history entry keeps under "DisplayState" (data) the raw blobs of one display interval,
+// concatenated: each is an optional 2-byte channel prefix 0x81 xx, a type byte, and a DLF record whose first
+// u16 (little-endian) is the record's length, so a blob is (prefix) + 1 + length bytes. Replaying re-feeds
+// each blob exactly as the generator first received it (prefix included) and then a tick, once per entry.
+// Entries without "DisplayState" data (such as the closing {"Description", "DLF"} entry) are skipped.
+//
+// Damaged raw data is not fatal: when a record length is below the DLF header or a blob runs past the end
+// of the entry's data, that entry's splitting stops there, the blobs before it and the entry's tick are still
+// produced, and the damage is counted in LogReadStats::badEntries, described in problems and logged as a
+// warning ("snap.velmar: entry 3: offset 40: record length 5 is shorter than the 12-byte header"). Entries
+// are numbered from 1 in the order of "Data". A file that is not a property list, or has no "Data" array, is
+// an error.
+#pragma once
+
+#include <string>
+
+#include "core/platform/plist/PlistValue.h"
+#include "logfile/LogItem.h"
+#include "logfile/LogReadError.h"
+
+namespace velmar {
+
+// The first byte of a 2-byte channel prefix in front of a blob.
+inline constexpr std::uint8_t kChannelPrefix = 0x81;
+inline constexpr std::size_t kChannelPrefixSize = 2;
+
+// Streams the blobs and ticks of a snapshot already parsed into root; name is used in messages. Items carry
+// their 1-based entry and their offset in that entry's data (a tick: the data's size).
+bool scanSnapshotValue(const PlistValue& root, const std::string& name, const LogItemCallback& callback,
+                       std::string& error, LogReadStats* stats = nullptr);
+LogReadResult parseSnapshotValue(const PlistValue& root, const std::string& name);
+
+bool forEachSnapshotItem(const std::string& path, const LogItemCallback& callback, std::string& error,
+                         LogReadStats* stats = nullptr);
+LogReadResult readSnapshotFile(const std::string& path);
+
+}  // namespace velmar

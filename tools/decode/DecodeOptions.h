@@ -1,0 +1,34 @@
+// DecodeOptions: the command line of velmar-decode.
+#pragma once
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "logfile/LogFormat.h"
+
+namespace velmar {
+
+struct DecodeOptions {
+    enum class Output { Display, State };
+
+    std::string technology;  // gsm, lte, utran, cdma or ifx
+    LogFormat format = LogFormat::Auto;
+    Output output = Output::Display;
+    bool everyTick = false;
+    bool saveContents = false;
+    bool startCommand = false;
+    bool logStderr = false;
+    bool help = false;
+    std::vector<std::string> files;
+};
+
+// Parses argv; on a usage error answers nullopt and sets error to a one-line message.
+std::optional<DecodeOptions> parseDecodeOptions(int argc, char** argv, std::string& error);
+
+// The technology constant for a command-line technology name, or empty when the name is unknown.
+std::string technologyConstantFor(const std::string& name);
+
+extern const char* const kDecodeUsage;
+
+}  // namespace velmar

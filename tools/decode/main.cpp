@@ -1,0 +1,159 @@
+// velmar-decode: feeds recorded baseband blobs through a technology's generator, exactly as the monitor's
+// model does, and prints the display (or the whole state, or the save contents) as JSON.
+//
+// Standard output carries JSON only: the generator family writes a few lines of its own to the C library's
+// standard output when it is destroyed, so the JSON goes to a duplicate of the original descriptor and
+// descriptor 1 is pointed at standard error for the rest of the run.
+#include <unistd.h>
+
+#include <cstdio>
+#include <memory>
+#include <string>
+
+#include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/StateKeys.h"
+#include "core/platform/Json.h"
+#include "core/platform/SystemLog.h"
+#include "logfile/LogFormat.h"
+#include "tools/decode/DecodeOptions.h"
+
+namespace velmar {
+namespace {
+
+constexpr int kExitUsageOrInput = 2;
+constexpr int kPrettyIndent = 2;
+
+class JsonOutput {
+public:
+    JsonOutput() {
+        std::fflush(stdout);
+        const int jsonDescriptor = dup(STDOUT_FILENO);
+        out_ = jsonDescriptor >= 0 ? fdopen(jsonDescriptor, "w") : nullptr;
+        if (out_ == nullptr) {
+            out_ = stdout;
+            return;
+        }
+        dup2(STDERR_FILENO, STDOUT_FILENO);
+    }
+    ~JsonOutput() {
+        if (out_ != stdout) {
+            std::fclose(out_);
+        }
+    }
+    JsonOutput(const JsonOutput&) = delete;
+    JsonOutput& operator=(const JsonOutput&) = delete;
+
+    void write(const PlistValue& value, int indent) {
+        std::string text = plistToJson(value, indent);
+        text.push_back('\n');
+        std::fwrite(text.data(), 1, text.size(), out_);
+        std::fflush(out_);
+    }
+
+private:
+    std::FILE* out_ = nullptr;
+};
+
+int fail(const std::string& message) {
+    std::fprintf(stderr, "velmar-decode: %s\n", message.c_str());
+    return kExitUsageOrInput;
+}
+
+void reportCaptureStatistics(const std::string& path, const LogReadStats& stats) {
+    if (stats.frames == 0 && stats.badFrames == 0 && stats.badEntries == 0) {
+        return;
+    }
+    SystemLog::log(kLogNotice, "%s: %llu frames, %llu log packets, %llu other frames, %llu wrapped, %llu bad",
+                   path.c_str(), static_cast<unsigned long long>(stats.frames),
+                   static_cast<unsigned long long>(stats.logPackets),
+                   static_cast<unsigned long long>(stats.otherFrames),
+                   static_cast<unsigned long long>(stats.wrappedFrames),
+                   static_cast<unsigned long long>(stats.badFrames));
+    if (stats.badFrames > 0) {
+        SystemLog::log(kLogError, "%s: %llu bad frames skipped (first at offset %llu)", path.c_str(),
+                       static_cast<unsigned long long>(stats.badFrames),
+                       static_cast<unsigned long long>(stats.badFrameOffsets.empty() ? 0 : stats.badFrameOffsets[0]));
+    }
+    for (const std::string& problem : stats.problems) {
+        SystemLog::log(kLogError, "%s", problem.c_str());
+    }
+}
+
+int run(const DecodeOptions& options) {
+    JsonOutput json;
+    std::unique_ptr<LogGenerator> generator =
+        LogGenerator::generatorFromTechnology(technologyConstantFor(options.technology));
+    if (!generator) {
+        return fail("technology '" + options.technology + "' has no generator in this build");
+    }
+    if (options.startCommand) {
+        json.write(generator->getStartCommand(), 0);
+        return 0;
+    }
+
+    const StateDict state = PlistDictionary::create();
+    auto shownValue = [&]() -> PlistValue {
+        return options.output == DecodeOptions::Output::State ? PlistValue(state)
+                                                              : state->get(state_keys::kDisplay);
+    };
+    auto refresh = [&]() {
+        generator->generateLogUsingState(state);
+        if (options.everyTick && !options.saveContents) {
+            json.write(shownValue(), 0);
+        }
+    };
+
+    for (const std::string& path : options.files) {
+        std::string error;
+        LogReadStats stats;
+        const bool read = forEachLogItem(
+            path, options.format,
+            [&](const LogItemView& item) {
+                if (item.isTick()) {
+                    refresh();
+                } else {
+                    generator->updateState(state, item.bytes);
+                }
+                return true;
+            },
+            error, &stats);
+        reportCaptureStatistics(path, stats);
+        if (!read) {
+            return fail(error);
+        }
+    }
+    refresh();
+
+    if (options.saveContents) {
+        json.write(generator->getSaveContentsFromState(state), kPrettyIndent);
+    } else if (!options.everyTick) {
+        json.write(shownValue(), kPrettyIndent);
+    }
+    return 0;
+}
+
+}  // namespace
+}  // namespace velmar
+
+int main(int argc, char** argv) {
+    using namespace velmar;
+    // An offline tool does not write the system journal: lines go nowhere unless --log-stderr mirrors them.
+    SystemLog::setSink([](int, const std::string&) {});
+    if (const char* level = std::getenv("VELMAR_LOG_LEVEL")) {
+        if (const int parsed = SystemLog::parseLevel(level); parsed >= 0) {
+            SystemLog::setThreshold(parsed);
+        }
+    }
+    std::string error;
+    const auto options = parseDecodeOptions(argc, argv, error);
+    if (!options) {
+        std::fprintf(stderr, "velmar-decode: %s (see --help)\n", error.c_str());
+        return 2;
+    }
+    if (options->help) {
+        std::fputs(kDecodeUsage, stdout);
+        return 0;
+    }
+    SystemLog::setMirrorToStderr(options->logStderr);
+    return run(*options);
+}
