@@ -10,6 +10,7 @@
 #include <memory>
 #include <string_view>
 
+#include "core/MonitorGenerator.h"
 #include "core/platform/ByteView.h"
 #include "core/platform/plist/PlistValue.h"
 
@@ -18,17 +19,17 @@ namespace velmar {
 // The state dictionary: owned by the model, filled by the generator.
 using StateDict = PlistDictionaryRef;
 
-class LogGenerator {
+class LogGenerator : public MonitorGenerator {
 public:
-    virtual ~LogGenerator() = default;
+    ~LogGenerator() override = default;
     LogGenerator(const LogGenerator&) = delete;
     LogGenerator& operator=(const LogGenerator&) = delete;
 
-    virtual void updateState(const StateDict& state, ByteView data);
+    void updateState(const StateDict& state, ByteView data) override;
     // The display tree, or none.
-    virtual PlistValue generateLogUsingState(const StateDict& state);
-    virtual PlistValue getStartCommand();
-    virtual PlistValue getSaveContentsFromState(const StateDict& state);
+    PlistValue generateLogUsingState(const StateDict& state) override;
+    PlistValue getStartCommand() override;
+    PlistValue getSaveContentsFromState(const StateDict& state) override;
 
     // Appends one history entry to the state's "History", keeping at most 5 entries.
     static void updateHistoryInState(const StateDict& state);

@@ -2,7 +2,12 @@
 // The names are compared for equality in the order of the table; the first match decides.
 #include <array>
 
+#include "LogGenerator/C2K/C2KLogGenerator.h"
+#include "LogGenerator/GSM/GSMLogGenerator.h"
+#include "LogGenerator/LTE/LTELogGenerator.h"
+#include "LogGenerator/GSM/ORV_GSMLogGenerator.h"
 #include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/UTRAN/UTRANLogGenerator.h"
 #include "core/platform/KxServerProtocol.h"
 
 namespace velmar {
@@ -17,11 +22,11 @@ struct TechnologyEntry {
 };
 
 constexpr std::array<TechnologyEntry, 5> kTechnologies{{
-    {kKxLogChannelTechnology_IFX, nullptr},
-    {kKxLogChannelTechnology_Orvane_GSM, nullptr},
-    {kKxLogChannelTechnology_Orvane_CDMA, nullptr},
-    {kKxLogChannelTechnology_Orvane_LTE, nullptr},
-    {kKxLogChannelTechnology_Orvane_UTRAN2, nullptr},
+    {kKxLogChannelTechnology_IFX, &GSMLogGenerator::generator},
+    {kKxLogChannelTechnology_Orvane_GSM, &ORV_GSMLogGenerator::generator},
+    {kKxLogChannelTechnology_Orvane_CDMA, &C2KLogGenerator::generator},
+    {kKxLogChannelTechnology_Orvane_LTE, &LTELogGenerator::generator},
+    {kKxLogChannelTechnology_Orvane_UTRAN2, &UTRANLogGenerator::generator},
 }};
 
 }  // namespace

@@ -87,7 +87,8 @@ bool xmlCannotHold(std::string_view text) {
             return true;
         }
     }
-    return text.find("\xEF\xBF\xBE") != std::string_view::npos || text.find("\xEF\xBF\xBF") != std::string_view::npos;
+    return text.find("\xEF\xBF\xBE") != std::string_view::npos ||
+           text.find("\xEF\xBF\xBF") != std::string_view::npos;
 }
 
 bool hasValueXmlCannotHold(const PlistValue& value) {

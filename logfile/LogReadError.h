@@ -25,6 +25,8 @@
 #include <string>
 #include <vector>
 
+#include <sys/stat.h>
+
 #include "logfile/LogItem.h"
 
 namespace velmar {
@@ -100,14 +102,18 @@ inline bool readFileBytes(const std::string& path, PlistData& bytes, std::string
         error = path + ": cannot open: " + std::strerror(errno);
         return false;
     }
-    // The size is only a hint (pipes have none); reading continues until the end either way.
+    // The size of a regular file is only a hint (pipes have none); reading continues until the end anyway.
     std::size_t chunk = 64 * 1024;
-    if (std::fseek(file, 0, SEEK_END) == 0) {
-        const long size = std::ftell(file);
-        if (size > 0) {
-            chunk = std::min(static_cast<std::size_t>(size) + 1, maxBytes);
+    struct stat info {};
+    if (fstat(fileno(file), &info) == 0) {
+        if (S_ISDIR(info.st_mode)) {
+            std::fclose(file);
+            error = path + ": cannot read: " + std::strerror(EISDIR);
+            return false;
         }
-        std::rewind(file);
+        if (S_ISREG(info.st_mode) && info.st_size > 0) {
+            chunk = std::min(static_cast<std::size_t>(info.st_size) + 1, maxBytes);
+        }
     }
     bool failed = false;
     while (bytes.size() < maxBytes) {

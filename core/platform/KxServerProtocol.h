@@ -5,6 +5,7 @@
 // dictionaries that the service supplies as extra records, and the port names of the service.
 #pragma once
 
+#include <cstdint>
 #include <string_view>
 
 namespace velmar {
@@ -50,5 +51,35 @@ VELMAR_KX_CONSTANT(kKxCellMonitorCellTypeNeighbor);
 
 // The service's control port.
 inline constexpr std::string_view kKxServerControlPortName = "com.velmar.kxserver";
+
+// Control messages (XML property lists, message id 0). A client asks
+//   {"Request": "CreateLogChannel", "ReceivePort": <name of the client's local port>}
+// and the service answers
+//   {"Domain": <integer>, "Error": <integer, 0 on success>, "ChannelPort": <name>, "Reason": <text on failure>}
+// after which the service connects to the receive port and streams blobs (message id 0) there, and listens on
+// ChannelPort for that channel's commands ("GetTechnology", the start command). Notifications from the
+// service arrive on the control connection as {"Notification": <name>, "Data": <any>}.
+inline constexpr std::string_view kKxRequestKey = "Request";
+inline constexpr std::string_view kKxRequestCreateLogChannel = "CreateLogChannel";
+inline constexpr std::string_view kKxReceivePortKey = "ReceivePort";
+inline constexpr std::string_view kKxDomainKey = "Domain";
+inline constexpr std::string_view kKxErrorKey = "Error";
+inline constexpr std::string_view kKxChannelPortKey = "ChannelPort";
+inline constexpr std::string_view kKxReasonKey = "Reason";
+inline constexpr std::string_view kKxNotificationKey = "Notification";
+inline constexpr std::string_view kKxNotificationDataKey = "Data";
+// Error domain of the service's own answers, and its error codes.
+inline constexpr std::int32_t kKxErrorDomainServer = 1;
+inline constexpr std::int32_t kKxErrorBadRequest = 1;
+inline constexpr std::int32_t kKxErrorCannotReachReceivePort = 2;
+inline constexpr std::int32_t kKxErrorCannotOpenChannelPort = 3;
+
+// Channel commands: {"GetTechnology": "GetTechnology"} answered with {"GetTechnology": <technology constant>};
+// the start command {"SetState": "Streaming", "SetOrvaneLogCodes": [...], "SetKxExtraCodes": [...]}.
+inline constexpr std::string_view kKxGetTechnologyKey = "GetTechnology";
+inline constexpr std::string_view kKxSetStateKey = "SetState";
+inline constexpr std::string_view kKxStreamingState = "Streaming";
+inline constexpr std::string_view kKxSetLogCodesKey = "SetOrvaneLogCodes";
+inline constexpr std::string_view kKxSetExtraCodesKey = "SetKxExtraCodes";
 
 }  // namespace velmar

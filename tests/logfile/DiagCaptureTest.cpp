@@ -5,6 +5,7 @@
 #include <chrono>
 #include <cstdio>
 #include <map>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -195,6 +196,13 @@ TEST(DiagCapture, WrapperWithoutInnerFrameIsBadAndOtherVersionsAreOther) {
     EXPECT_EQ(other.stats.otherFrames, 1U);
     EXPECT_EQ(other.stats.badFrames, 0U);
     EXPECT_EQ(other.stats.wrappedFrames, 0U);
+
+    const LogReadResult reply = parseDiagCaptureBytes(
+        framed({0x98, 0x01, 0x00, 0x00, 0x01, 0x00, 0x00, 0x00, 0x4B, 0x12, 0x0F, 0x02}), "w.qmdl");
+    EXPECT_TRUE(reply.items.empty());
+    EXPECT_EQ(reply.stats.otherFrames, 1U);
+    EXPECT_EQ(reply.stats.wrappedFrames, 1U);
+    EXPECT_EQ(reply.stats.badFrames, 0U);
 }
 
 TEST(DiagCapture, CommandRepliesAreCountedAsOtherAndEmptyFramesIgnored) {
@@ -398,6 +406,46 @@ TEST(DiagCaptureSamples, CollectingAndAutoDetectedReadsAgreeWithStreaming) {
     EXPECT_EQ(logFormatForContent(std::span(reinterpret_cast<const std::uint8_t*>(contents.data()),
                                             std::min<std::size_t>(contents.size(), kLogFormatProbeSize))),
               LogFormat::DiagCapture);
+}
+
+TEST(DiagCaptureSamples, RandomDamageKeepsEveryBlobWellFormed) {
+    const std::string contents = testing::readWholeFile(capturePath("nas-lte-1.qmdl"));
+    ASSERT_GT(contents.size(), 20000U);
+    const Bytes original(contents.begin(), contents.begin() + 20000);
+    std::mt19937 random(12345);
+    std::uint64_t totalBad = 0;
+    std::uint64_t totalBlobs = 0;
+    for (int round = 0; round < 200; ++round) {
+        Bytes damaged = original;
+        // Flip bytes, favouring the framing bytes, and cut the stream at a random place.
+        for (int flips = 0; flips < 8; ++flips) {
+            const std::size_t at = random() % damaged.size();
+            const std::uint8_t choices[] = {0x7E, 0x7D, 0x98, 0x10, static_cast<std::uint8_t>(random())};
+            damaged[at] = choices[random() % 5];
+        }
+        damaged.resize(random() % damaged.size());
+        LogReadStats stats;
+        std::string error;
+        std::uint64_t malformed = 0;
+        ASSERT_TRUE(scanDiagCaptureBytes(
+            damaged, "damaged.qmdl",
+            [&](const LogItemView& item) {
+                const bool wellFormed =
+                    item.bytes.size() >= 13 && item.bytes[0] == 0x01 &&
+                    static_cast<std::size_t>(item.bytes[1] | item.bytes[2] << 8) == item.bytes.size() - 1 &&
+                    item.offset < damaged.size();
+                malformed += wellFormed ? 0 : 1;
+                return true;
+            },
+            error, &stats));
+        EXPECT_EQ(malformed, 0U);
+        EXPECT_EQ(stats.frames, stats.logPackets + stats.otherFrames + stats.badFrames);
+        EXPECT_EQ(stats.blobs, stats.logPackets);
+        totalBad += stats.badFrames;
+        totalBlobs += stats.blobs;
+    }
+    EXPECT_GT(totalBad, 200U);
+    EXPECT_GT(totalBlobs, 10000U);
 }
 
 }  // namespace

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <random>
 #include <string>
 #include <vector>
 
@@ -106,6 +107,7 @@ TEST(DlfFile, FileErrorsNameThePath) {
               path + ": offset 28: record length 0 is shorter than the 12-byte header");
     const std::string missing = directory.file("missing.dlf");
     EXPECT_EQ(readDlfFile(missing).error, missing + ": cannot open: No such file or directory");
+    EXPECT_EQ(readDlfFile(directory.path()).error, directory.path() + ": cannot read: Is a directory");
     std::string error;
     EXPECT_FALSE(appendToDlfFile(directory.file("no/dir.dlf"), kFirst, error));
     EXPECT_EQ(error, directory.file("no/dir.dlf") + ": cannot open for appending: No such file or directory");
@@ -149,6 +151,48 @@ TEST(DlfFile, IsDetectedByExtensionAndIsTheFallbackForBinaryContent) {
     EXPECT_EQ(error, directory.file("absent") + ": cannot open: No such file or directory");
     EXPECT_EQ(readLogFile(directory.file("absent")).error,
               directory.file("absent") + ": cannot open: No such file or directory");
+}
+
+TEST(DlfFile, RandomBytesYieldWellFormedBlobsOrAnError) {
+    std::mt19937 random(4242);
+    std::size_t accepted = 0;
+    for (int round = 0; round < 300; ++round) {
+        // A few valid records, then in most rounds some damage: a changed byte or a cut.
+        Bytes bytes;
+        for (unsigned count = random() % 5; count > 0; --count) {
+            const Bytes payload(random() % 6, static_cast<std::uint8_t>(random()));
+            ASSERT_TRUE(appendDlfRecord(bytes, static_cast<std::uint16_t>(random()), random(), payload));
+        }
+        if (!bytes.empty() && random() % 3 != 0) {
+            if (random() % 2 == 0) {
+                bytes[random() % bytes.size()] = static_cast<std::uint8_t>(random() % 32);
+            } else {
+                bytes.resize(random() % bytes.size());
+            }
+        }
+        std::size_t covered = 0;
+        std::string error;
+        const bool ok = scanDlfBytes(
+            bytes, "random.dlf",
+            [&](const LogItemView& item) {
+                EXPECT_EQ(item.offset, covered);
+                EXPECT_EQ(item.bytes[0], kLogTypeOrdinary);
+                EXPECT_EQ(static_cast<std::size_t>(item.bytes[1] | item.bytes[2] << 8),
+                          item.bytes.size() - 1);
+                EXPECT_TRUE(std::equal(item.bytes.begin() + 1, item.bytes.end(), bytes.begin() + covered));
+                covered += item.bytes.size() - 1;
+                return true;
+            },
+            error);
+        EXPECT_EQ(ok, covered == bytes.size());
+        EXPECT_EQ(ok, error.empty());
+        if (!ok) {
+            EXPECT_EQ(error.rfind("random.dlf: offset " + std::to_string(covered) + ": ", 0), 0U) << error;
+        }
+        accepted += ok ? 1 : 0;
+    }
+    EXPECT_GT(accepted, 50U);
+    EXPECT_LT(accepted, 250U);
 }
 
 }  // namespace

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <random>
 #include <string>
 #include <vector>
 
@@ -131,6 +132,34 @@ TEST(HexBlobFile, FileRoundTripAndErrors) {
     EXPECT_EQ(readHexBlobFile(missing).error, missing + ": cannot open: No such file or directory");
     EXPECT_FALSE(writeHexBlobFile(directory.file("no/such/dir.hex"), items, error));
     EXPECT_EQ(error, directory.file("no/such/dir.hex") + ": cannot create: No such file or directory");
+}
+
+TEST(HexBlobFile, RandomItemsSurviveTheRoundTrip) {
+    std::mt19937 random(99);
+    std::vector<LogItem> items;
+    for (int i = 0; i < 500; ++i) {
+        if (random() % 5 == 0) {
+            items.push_back(LogItem::tick());
+            continue;
+        }
+        Bytes bytes(1 + random() % 40);
+        for (std::uint8_t& byte : bytes) {
+            byte = static_cast<std::uint8_t>(random());
+        }
+        items.push_back(LogItem::blob(std::move(bytes)));
+    }
+    const std::string text = formatHexBlobText(items);
+    const LogReadResult back = parseHexBlobText(text, "random.hex");
+    ASSERT_TRUE(back.ok()) << back.error;
+    ASSERT_EQ(back.items.size(), items.size());
+    std::uint64_t offset = 0;
+    for (std::size_t i = 0; i < items.size(); ++i) {
+        EXPECT_EQ(back.items[i].kind, items[i].kind);
+        EXPECT_EQ(back.items[i].bytes, items[i].bytes);
+        EXPECT_EQ(back.items[i].line, i + 1);
+        EXPECT_EQ(back.items[i].offset, offset);
+        offset = text.find('\n', offset) + 1;
+    }
 }
 
 TEST(HexBlobFile, CallbackCanStopTheReader) {

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <random>
 #include <string>
 #include <vector>
 
@@ -121,6 +122,36 @@ TEST(SnapshotFile, DamagedDataEndsOnlyThatEntry) {
     };
     EXPECT_EQ(result.stats.problems, problems);
     EXPECT_EQ(log.textsAt(kLogWarning), problems);
+}
+
+TEST(SnapshotFile, RandomDataNeverYieldsABlobOutsideTheEntry) {
+    std::mt19937 random(777);
+    for (int round = 0; round < 300; ++round) {
+        Bytes data(random() % 96);
+        for (std::uint8_t& byte : data) {
+            const std::uint8_t choices[] = {0x81, 0x01, 0x0C, 0x00, static_cast<std::uint8_t>(random())};
+            byte = choices[random() % 5];
+        }
+        const LogReadResult result = parseSnapshotValue(snapshotOf({entryWithState(data)}), "random.velmar");
+        ASSERT_TRUE(result.ok()) << result.error;
+        ASSERT_FALSE(result.items.empty());
+        EXPECT_TRUE(result.items.back().isTick());
+        // The blobs tile the data from its start, each as long as its length field says.
+        std::size_t covered = 0;
+        for (std::size_t i = 0; i + 1 < result.items.size(); ++i) {
+            const LogItem& item = result.items[i];
+            ASSERT_TRUE(item.isBlob());
+            EXPECT_EQ(item.offset, covered);
+            const std::size_t prefix = item.bytes[0] == kChannelPrefix ? kChannelPrefixSize : 0;
+            ASSERT_GE(item.bytes.size(), prefix + 3);
+            const std::size_t length = item.bytes[prefix + 1] | item.bytes[prefix + 2] << 8;
+            EXPECT_GE(length, 12U);
+            EXPECT_EQ(item.bytes.size(), prefix + 1 + length);
+            EXPECT_TRUE(std::equal(item.bytes.begin(), item.bytes.end(), data.begin() + covered));
+            covered += item.bytes.size();
+        }
+        EXPECT_EQ(result.stats.badEntries, covered == data.size() ? 0U : 1U);
+    }
 }
 
 TEST(SnapshotFile, SnapshotWithoutDataArrayIsAnError) {

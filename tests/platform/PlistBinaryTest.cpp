@@ -24,9 +24,13 @@ PlistValue dictionaryOf(std::initializer_list<std::pair<std::string_view, PlistV
     return PlistValue(dictionary);
 }
 
-PlistValue arrayOf(std::initializer_list<PlistValue> items) { return PlistValue(PlistArray::create(items)); }
+PlistValue arrayOf(std::initializer_list<PlistValue> items) {
+    return PlistValue(PlistArray::create(items));
+}
 
-void append(Bytes& out, std::initializer_list<std::uint8_t> bytes) { out.insert(out.end(), bytes); }
+void append(Bytes& out, std::initializer_list<std::uint8_t> bytes) {
+    out.insert(out.end(), bytes);
+}
 
 void appendBigEndian(Bytes& out, std::uint64_t value, int width) {
     for (int i = width - 1; i >= 0; --i) {
@@ -59,6 +63,9 @@ std::optional<PlistValue> parseBytes(const Bytes& bytes, std::string* error = nu
     return parsePropertyList(bytes, error);
 }
 
+// Byte tables laid out one object per line.
+// clang-format off
+
 // {"a": 1}, written out by hand.
 const Bytes kDictionaryFixture = {
     'b', 'p', 'l', 'i', 's', 't', '0', '0',
@@ -75,18 +82,20 @@ const Bytes kDictionaryFixture = {
 // ["Grüße", "𝄞", 2.5f, 2026-03-04T05:06:07Z, true], written out by hand.
 const Bytes kArrayFixture = {
     'b', 'p', 'l', 'i', 's', 't', '0', '0',
-    0xA5, 0x01, 0x02, 0x03, 0x04, 0x05,  // offset 8: array of five
+    0xA5, 0x01, 0x02, 0x03, 0x04, 0x05,                                // offset 8: array of five
     0x65, 0x00, 0x47, 0x00, 0x72, 0x00, 0xFC, 0x00, 0xDF, 0x00, 0x65,  // offset 14: UTF-16BE "Grüße"
-    0x62, 0xD8, 0x34, 0xDD, 0x1E,        // offset 25: UTF-16BE surrogate pair for U+1D11E
-    0x22, 0x40, 0x20, 0x00, 0x00,        // offset 30: 4-byte real 2.5
-    0x33, 0x41, 0xC7, 0xAB, 0xFA, 0x9F, 0x80, 0x00, 0x00,  // offset 35: date, 794293567 s after 2001
-    0x09,                                // offset 44: true
-    0x08, 0x0E, 0x19, 0x1E, 0x23, 0x2C,  // offset 45: offset table
-    0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x01, 0x01,
-    0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x06,
-    0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00,
-    0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x2D,
+    0x62, 0xD8, 0x34, 0xDD, 0x1E,                                      // offset 25: surrogate pair, U+1D11E
+    0x22, 0x40, 0x20, 0x00, 0x00,                                      // offset 30: 4-byte real 2.5
+    0x33, 0x41, 0xC7, 0xAB, 0xFA, 0x9F, 0x80, 0x00, 0x00,              // offset 35: date, 2001 + 794293567 s
+    0x09,                                                              // offset 44: true
+    0x08, 0x0E, 0x19, 0x1E, 0x23, 0x2C,                                // offset 45: offset table
+    0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x01, 0x01,                    // trailer: widths 1 and 1
+    0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x06,                    // six objects
+    0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00,                    // top object 0
+    0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x00, 0x2D,                    // offset table at 45
 };
+
+// clang-format on
 
 TEST(PlistBinaryReader, ReadsHandWrittenDictionary) {
     std::string error;
@@ -137,14 +146,16 @@ TEST(PlistBinaryWriter, UsesTheSmallestIntegerWidth) {
     EXPECT_EQ(objectBytes(PlistValue::integer(65536)), (Bytes{0x12, 0x00, 0x01, 0x00, 0x00}));
     EXPECT_EQ(objectBytes(PlistValue::integer(0x100000000)),
               (Bytes{0x13, 0x00, 0x00, 0x00, 0x01, 0x00, 0x00, 0x00, 0x00}));
-    EXPECT_EQ(objectBytes(PlistValue::integer(-1)), (Bytes{0x13, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF}));
+    EXPECT_EQ(objectBytes(PlistValue::integer(-1)),
+              (Bytes{0x13, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF}));
     EXPECT_EQ(objectBytes(PlistValue::real(1.0)), (Bytes{0x23, 0x3F, 0xF0, 0, 0, 0, 0, 0, 0}));
     EXPECT_EQ(objectBytes(PlistValue::date(PlistDate{978307200})), (Bytes{0x33, 0, 0, 0, 0, 0, 0, 0, 0}));
     EXPECT_EQ(objectBytes(PlistValue::boolean(false)), (Bytes{0x08}));
     EXPECT_EQ(objectBytes(PlistValue::data({1, 2})), (Bytes{0x42, 0x01, 0x02}));
     // Fifteen characters and more take a separate length.
-    EXPECT_EQ(objectBytes(PlistValue("abcdefghijklmno")),
-              (Bytes{0x5F, 0x10, 0x0F, 'a', 'b', 'c', 'd', 'e', 'f', 'g', 'h', 'i', 'j', 'k', 'l', 'm', 'n', 'o'}));
+    EXPECT_EQ(
+        objectBytes(PlistValue("abcdefghijklmno")),
+        (Bytes{0x5F, 0x10, 0x0F, 'a', 'b', 'c', 'd', 'e', 'f', 'g', 'h', 'i', 'j', 'k', 'l', 'm', 'n', 'o'}));
 }
 
 TEST(PlistBinaryReader, ReadsSixteenByteIntegersThatFit) {
@@ -254,9 +265,10 @@ TEST(PlistBinaryWriter, RoundTripsLargeCountsWithWideReferencesAndOffsets) {
 
 TEST(PlistBinaryWriter, CrossesWithTheXmlEncoding) {
     // Whole-second dates and finite reals survive binary -> value -> XML -> value unchanged.
-    const PlistValue value = dictionaryOf({{"n", PlistValue::integer(-7)},
-                                           {"when", PlistValue::date(PlistDate{1772600767})},
-                                           {"rows", arrayOf({dictionaryOf({{"Name", "RSRP"}, {"Value", "-97"}})})}});
+    const PlistValue value =
+        dictionaryOf({{"n", PlistValue::integer(-7)},
+                      {"when", PlistValue::date(PlistDate{1772600767})},
+                      {"rows", arrayOf({dictionaryOf({{"Name", "RSRP"}, {"Value", "-97"}})})}});
     const auto fromBinary = parsePropertyList(*serializeBinary(value));
     ASSERT_TRUE(fromBinary);
     const auto xml = serializeXml(*fromBinary);

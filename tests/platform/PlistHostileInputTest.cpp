@@ -21,7 +21,8 @@ std::span<const std::uint8_t> bytesOf(std::string_view text) {
 }
 
 // Parses text, expecting a failure whose message starts with prefix and mentions fragment.
-void expectFailure(std::span<const std::uint8_t> document, std::string_view prefix, std::string_view fragment) {
+void expectFailure(std::span<const std::uint8_t> document, std::string_view prefix,
+                   std::string_view fragment) {
     std::string error;
     const auto value = parsePropertyList(document, &error);
     EXPECT_FALSE(value) << "accepted: " << std::string(document.begin(), document.end()).substr(0, 200);
@@ -34,7 +35,9 @@ void expectXmlFailure(std::string_view document, std::string_view fragment) {
     expectFailure(bytesOf(document), "line ", fragment);
 }
 
-std::string wrapped(std::string_view value) { return "<plist version=\"1.0\">" + std::string(value) + "</plist>"; }
+std::string wrapped(std::string_view value) {
+    return "<plist version=\"1.0\">" + std::string(value) + "</plist>";
+}
 
 void appendBigEndian(Bytes& out, std::uint64_t value, int width) {
     for (int i = width - 1; i >= 0; --i) {
@@ -60,7 +63,10 @@ Bytes assemble(const std::vector<Bytes>& objects, Trailer trailer = {}) {
         out.insert(out.end(), object.begin(), object.end());
     }
     const std::uint64_t table = out.size();
-    const int width = trailer.offsetWidth != 0 ? trailer.offsetWidth : table > 0xFFFF ? 4 : table > 0xFF ? 2 : 1;
+    const int width = trailer.offsetWidth != 0 ? trailer.offsetWidth
+                      : table > 0xFFFF         ? 4
+                      : table > 0xFF           ? 2
+                                               : 1;
     for (const auto offset : offsets) {
         appendBigEndian(out, offset, width > 8 ? 8 : width);
     }
@@ -104,7 +110,8 @@ TEST(PlistHostileXml, RejectsNestingBeyondTheLimit) {
     const auto deepest = parsePropertyList(bytesOf(nestedXmlArrays(kMaxPlistDepth)));
     ASSERT_TRUE(deepest);
     int depth = 0;
-    for (PlistValue at = *deepest; at.isArray(); at = at.array()->empty() ? PlistValue() : at.array()->at(0)) {
+    for (PlistValue at = *deepest; at.isArray();
+         at = at.array()->empty() ? PlistValue() : at.array()->at(0)) {
         ++depth;
     }
     EXPECT_EQ(depth, kMaxPlistDepth);
@@ -142,9 +149,10 @@ TEST(PlistHostileXml, NeverLoadsExternalEntities) {
         "internal subset");
     // An external DTD is named but never read, so an entity it might declare is undeclared here.
     std::string error;
-    EXPECT_FALSE(parsePropertyList(bytesOf("<?xml version=\"1.0\"?>\n<!DOCTYPE plist SYSTEM \"file:///etc/passwd\">\n"
-                                           "<plist><string>&passwd;</string></plist>"),
-                                   &error));
+    EXPECT_FALSE(
+        parsePropertyList(bytesOf("<?xml version=\"1.0\"?>\n<!DOCTYPE plist SYSTEM \"file:///etc/passwd\">\n"
+                                  "<plist><string>&passwd;</string></plist>"),
+                          &error));
     EXPECT_EQ(error, "line 3: reference to undeclared entity 'passwd'");
     expectXmlFailure("<plist><string>&undeclared;</string></plist>", "undefined entity");
 }
@@ -152,7 +160,8 @@ TEST(PlistHostileXml, NeverLoadsExternalEntities) {
 TEST(PlistHostileXml, AcceptsTheStandardDocumentType) {
     const auto value = parsePropertyList(
         bytesOf("<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<!DOCTYPE plist PUBLIC \"-//Brindle//DTD PLIST "
-                "1.0//EN\" \"PropertyList-1.0.dtd\">\n<plist version=\"1.0\"><string>ok &amp; fine</string></plist>"));
+                "1.0//EN\" \"PropertyList-1.0.dtd\">\n<plist version=\"1.0\"><string>ok &amp; "
+                "fine</string></plist>"));
     ASSERT_TRUE(value && value->isString());
     EXPECT_EQ(*value->string(), "ok & fine");
 }
@@ -185,18 +194,19 @@ TEST(PlistHostileXml, SurvivesTruncationAtEveryLength) {
 }
 
 TEST(PlistHostileXml, RejectsBadBase64) {
-    for (const char* text : {"AAH", "A===", "AA=A", "AA==AA==", "@@@@", "AAH+/w=", "QQ==QQ==", "QQ=\n=Q", "Q"}) {
+    for (const char* text :
+         {"AAH", "A===", "AA=A", "AA==AA==", "@@@@", "AAH+/w=", "QQ==QQ==", "QQ=\n=Q", "Q"}) {
         expectXmlFailure(wrapped("<data>" + std::string(text) + "</data>"), "invalid base64");
     }
 }
 
 TEST(PlistHostileXml, RejectsBadDates) {
-    for (const char* text : {"2026-13-01T00:00:00Z", "2026-00-10T00:00:00Z", "2026-01-00T00:00:00Z",
-                             "2026-02-29T00:00:00Z", "1900-02-29T00:00:00Z", "2026-04-31T00:00:00Z",
-                             "2026-01-01T24:00:00Z", "2026-01-01T23:60:00Z", "2026-01-01T23:59:60Z",
-                             "2026-01-01 00:00:00Z", "2026-01-01T00:00:00", "2026-01-01T00:00:00+01:00",
-                             "26-01-01T00:00:00Z", "2026-01-01T00:00:00.Z", "2026-1-01T00:00:00Z",
-                             "2026-01-01T00:00:00ZZ", "", "yesterday"}) {
+    for (const char* text :
+         {"2026-13-01T00:00:00Z", "2026-00-10T00:00:00Z", "2026-01-00T00:00:00Z", "2026-02-29T00:00:00Z",
+          "1900-02-29T00:00:00Z", "2026-04-31T00:00:00Z", "2026-01-01T24:00:00Z", "2026-01-01T23:60:00Z",
+          "2026-01-01T23:59:60Z", "2026-01-01 00:00:00Z", "2026-01-01T00:00:00", "2026-01-01T00:00:00+01:00",
+          "26-01-01T00:00:00Z", "2026-01-01T00:00:00.Z", "2026-1-01T00:00:00Z", "2026-01-01T00:00:00ZZ", "",
+          "yesterday"}) {
         expectXmlFailure(wrapped("<date>" + std::string(text) + "</date>"), "invalid date");
     }
     std::string error;
@@ -205,9 +215,9 @@ TEST(PlistHostileXml, RejectsBadDates) {
 }
 
 TEST(PlistHostileXml, RejectsIntegerOverflowAndGarbage) {
-    for (const char* text : {"9223372036854775808", "-9223372036854775809", "0x8000000000000000",
-                             "18446744073709551615", "99999999999999999999999", "", "12x", "1.5", "--1", "+-1",
-                             "0x", "0xG", "1 2", "- 1"}) {
+    for (const char* text :
+         {"9223372036854775808", "-9223372036854775809", "0x8000000000000000", "18446744073709551615",
+          "99999999999999999999999", "", "12x", "1.5", "--1", "+-1", "0x", "0xG", "1 2", "- 1"}) {
         expectXmlFailure(wrapped("<integer>" + std::string(text) + "</integer>"), "integer");
     }
     std::string error;
@@ -239,7 +249,8 @@ TEST(PlistHostileXml, RejectsMalformedDictionaries) {
                      "expected <key> in <dict>, found <integer>");
     expectXmlFailure(wrapped("<dict><key>a</key></dict>"), "key 'a' has no value");
     expectXmlFailure(wrapped("<dict><key>a</key><key>b</key><true/></dict>"), "key 'a' has no value");
-    expectXmlFailure(wrapped("<dict><key>a</key><true/><true/></dict>"), "expected <key> in <dict>, found <true>");
+    expectXmlFailure(wrapped("<dict><key>a</key><true/><true/></dict>"),
+                     "expected <key> in <dict>, found <true>");
     expectXmlFailure(wrapped("<array><key>a</key></array>"), "<key> outside a dictionary");
     expectXmlFailure(wrapped("<key>a</key>"), "<key> outside a dictionary");
     expectXmlFailure("<key>a</key>", "<key> outside a dictionary");
@@ -250,6 +261,7 @@ TEST(PlistHostileXml, RejectsMalformedDictionaries) {
 TEST(PlistHostileXml, RejectsUnknownElementsStrayTextAndBadStructure) {
     expectXmlFailure(wrapped("<foo/>"), "unknown element <foo>");
     expectXmlFailure("<foo/>", "unknown element <foo>");
+    expectXmlFailure(wrapped("<\xC3\xA9l\xC3\xA9ment/>"), "unknown element <??l??ment>");
     expectXmlFailure(wrapped("<dict><key>a</key><bar/></dict>"), "unknown element <bar>");
     expectXmlFailure(wrapped("hello<true/>"), "unexpected text 'hello' in <plist>");
     expectXmlFailure(wrapped("<dict>x<key>a</key><true/></dict>"), "unexpected text 'x' in <dict>");
@@ -310,10 +322,13 @@ TEST(PlistHostileBinary, RejectsOutOfRangeOffsetsAndReferences) {
     expectBinaryFailure(bad, "outside the object area");
     expectBinaryFailure(assemble({{0xA1, 0x07}, {0x09}}), "object reference 7 out of range");
     expectBinaryFailure(assemble({{0x09}}, Trailer{.topObject = 1}), "top object 1 out of range");
-    expectBinaryFailure(assemble({{0x09}}, Trailer{.tableOffset = 4}), "offset table position 4 out of range");
-    expectBinaryFailure(assemble({{0x09}}, Trailer{.tableOffset = 1000}), "offset table position 1000 out of range");
+    expectBinaryFailure(assemble({{0x09}}, Trailer{.tableOffset = 4}),
+                        "offset table position 4 out of range");
+    expectBinaryFailure(assemble({{0x09}}, Trailer{.tableOffset = 1000}),
+                        "offset table position 1000 out of range");
     expectBinaryFailure(assemble({{0x09}}, Trailer{.objectCount = 0}), "no objects");
-    expectBinaryFailure(assemble({{0x09}}, Trailer{.objectCount = 1ULL << 60}), "does not fit the offset table");
+    expectBinaryFailure(assemble({{0x09}}, Trailer{.objectCount = 1ULL << 60}),
+                        "does not fit the offset table");
     expectBinaryFailure(assemble({{0x09}}, Trailer{.objectCount = ~0ULL}), "does not fit the offset table");
     expectBinaryFailure(assemble({{0x09}}, Trailer{.topObject = ~0ULL}), "out of range");
     expectBinaryFailure(assemble({{0x09}}, Trailer{.offsetWidth = 9}), "invalid offset size 9");
@@ -349,14 +364,17 @@ TEST(PlistHostileBinary, RejectsBadObjects) {
     expectBinaryFailure(assemble({{0x13, 0x00, 0x01}}), "truncated integer");
     expectBinaryFailure(assemble({{0x21, 0x00, 0x00}}), "unsupported real size");
     expectBinaryFailure(assemble({{0x23, 0x00}}), "truncated real");
-    expectBinaryFailure(assemble({{0x34, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0}}), "unsupported date");
+    expectBinaryFailure(assemble({{0x34, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0}}),
+                        "unsupported date");
     expectBinaryFailure(assemble({{0x33, 0x7F, 0xF8, 0, 0, 0, 0, 0, 0}}), "date is not a finite number");
     expectBinaryFailure(assemble({{0x51, 0xE9}}), "ASCII string holds a byte above 0x7F");
     expectBinaryFailure(assemble({{0x61, 0xD8, 0x00}}), "unpaired UTF-16 surrogate");
     expectBinaryFailure(assemble({{0x61, 0xDC, 0x00}}), "unpaired UTF-16 surrogate");
     expectBinaryFailure(assemble({{0x62, 0xD8, 0x00, 0x00, 0x41}}), "unpaired UTF-16 surrogate");
-    expectBinaryFailure(assemble({{0xD1, 0x01, 0x02}, {0x10, 0x01}, {0x51, 'x'}}), "dictionary key is not a string");
-    expectBinaryFailure(assemble({{0xD1, 0x01, 0x02}, {0xA0}, {0x51, 'x'}}), "dictionary key is not a string");
+    expectBinaryFailure(assemble({{0xD1, 0x01, 0x02}, {0x10, 0x01}, {0x51, 'x'}}),
+                        "dictionary key is not a string");
+    expectBinaryFailure(assemble({{0xD1, 0x01, 0x02}, {0xA0}, {0x51, 'x'}}),
+                        "dictionary key is not a string");
     std::string error;
     EXPECT_FALSE(parsePropertyList(assemble({{0xA2, 0x01, 0x02}, {0x09}, {0x00}}), &error));
     EXPECT_EQ(error, "offset 12: null object");
@@ -405,9 +423,9 @@ TEST(PlistHostileBinary, SurvivesEverySingleByteCorruption) {
     ASSERT_TRUE(full);
     int rejected = 0;
     for (std::size_t at = 8; at < full->size(); ++at) {
-        for (const std::uint8_t replacement : {std::uint8_t{0x00}, std::uint8_t{0xFF},
-                                               static_cast<std::uint8_t>((*full)[at] ^ 0x80),
-                                               static_cast<std::uint8_t>((*full)[at] + 1)}) {
+        for (const std::uint8_t replacement :
+             {std::uint8_t{0x00}, std::uint8_t{0xFF}, static_cast<std::uint8_t>((*full)[at] ^ 0x80),
+              static_cast<std::uint8_t>((*full)[at] + 1)}) {
             Bytes corrupt = *full;
             corrupt[at] = replacement;
             std::string error;

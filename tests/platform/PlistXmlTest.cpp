@@ -31,7 +31,9 @@ std::string document(std::initializer_list<std::string_view> lines) {
     return text;
 }
 
-std::string text(const PlistData& bytes) { return std::string(bytes.begin(), bytes.end()); }
+std::string text(const PlistData& bytes) {
+    return std::string(bytes.begin(), bytes.end());
+}
 
 std::span<const std::uint8_t> bytesOf(std::string_view text) {
     return {reinterpret_cast<const std::uint8_t*>(text.data()), text.size()};
@@ -55,7 +57,9 @@ PlistValue dictionaryOf(std::initializer_list<std::pair<std::string_view, PlistV
     return PlistValue(dictionary);
 }
 
-PlistValue arrayOf(std::initializer_list<PlistValue> items) { return PlistValue(PlistArray::create(items)); }
+PlistValue arrayOf(std::initializer_list<PlistValue> items) {
+    return PlistValue(PlistArray::create(items));
+}
 
 TEST(PlistXmlWriter, WritesSmallDictionaryByteForByte) {
     const std::string expected =
@@ -72,11 +76,10 @@ TEST(PlistXmlWriter, WritesSmallDictionaryByteForByte) {
 
 TEST(PlistXmlWriter, IndentsNestedContainersOneTabPerLevel) {
     const PlistValue value = dictionaryOf({
-        {"Display",
-         dictionaryOf({
-             {"Rows", arrayOf({dictionaryOf({{"Name", "RSRP"}}), PlistValue::newArray()})},
-             {"Empty", PlistValue::newDictionary()},
-         })},
+        {"Display", dictionaryOf({
+                        {"Rows", arrayOf({dictionaryOf({{"Name", "RSRP"}}), PlistValue::newArray()})},
+                        {"Empty", PlistValue::newDictionary()},
+                    })},
     });
     EXPECT_EQ(xmlOf(value), document({
                                 "<dict>",
@@ -177,8 +180,10 @@ TEST(PlistXmlWriter, WritesScalarRootAtColumnZero) {
 TEST(PlistXmlWriter, WritesDatesBeforeNineteenSeventyAndDropsFractions) {
     EXPECT_EQ(xmlOf(PlistValue::date(PlistDate{-1})), document({"<date>1969-12-31T23:59:59Z</date>"}));
     EXPECT_EQ(xmlOf(PlistValue::date(PlistDate{-0.5})), document({"<date>1969-12-31T23:59:59Z</date>"}));
-    EXPECT_EQ(xmlOf(PlistValue::date(PlistDate{951825600.75})), document({"<date>2000-02-29T12:00:00Z</date>"}));
-    EXPECT_EQ(xmlOf(PlistValue::date(PlistDate{-62135596800})), document({"<date>0001-01-01T00:00:00Z</date>"}));
+    EXPECT_EQ(xmlOf(PlistValue::date(PlistDate{951825600.75})),
+              document({"<date>2000-02-29T12:00:00Z</date>"}));
+    EXPECT_EQ(xmlOf(PlistValue::date(PlistDate{-62135596800})),
+              document({"<date>0001-01-01T00:00:00Z</date>"}));
 }
 
 TEST(PlistXmlWriter, EscapesCarriageReturnSoThatItSurvives) {
@@ -212,7 +217,8 @@ TEST(PlistXmlWriter, FailsOnDatesOutsideFourDigitYears) {
     EXPECT_FALSE(serializeXml(PlistValue::date(PlistDate{-62167219201})));  // 0000-01-01 minus a second
     EXPECT_FALSE(serializeXml(PlistValue::date(PlistDate{253402300800})));  // 10000-01-01
     EXPECT_FALSE(serializeXml(PlistValue::date(PlistDate{std::numeric_limits<double>::infinity()})));
-    EXPECT_EQ(xmlOf(PlistValue::date(PlistDate{253402300799})), document({"<date>9999-12-31T23:59:59Z</date>"}));
+    EXPECT_EQ(xmlOf(PlistValue::date(PlistDate{253402300799})),
+              document({"<date>9999-12-31T23:59:59Z</date>"}));
 }
 
 TEST(PlistXmlWriter, FailsOnTreeThatContainsItself) {
@@ -225,7 +231,8 @@ TEST(PlistXmlWriter, FailsOnTreeThatContainsItself) {
 TEST(PlistXmlWriter, WriteXmlFileWritesTheSerialisedText) {
     testing::TemporaryDirectory directory;
     const std::string path = directory.file("state.plist");
-    const PlistValue value = dictionaryOf({{"GetTechnology", "GetTechnology"}, {"n", PlistValue::integer(3)}});
+    const PlistValue value =
+        dictionaryOf({{"GetTechnology", "GetTechnology"}, {"n", PlistValue::integer(3)}});
     ASSERT_TRUE(writeXmlFile(value, path));
     EXPECT_EQ(testing::readWholeFile(path), xmlOf(value));
     // Writing again replaces the contents.
@@ -246,9 +253,9 @@ TEST(PlistXmlWriter, WriteXmlFileFailsOnUnwritablePathOrNonDictionary) {
 
 TEST(PlistXmlReader, ReadsTheSmallDictionary) {
     std::string error;
-    const auto value = parseText(document({"<dict>", "\t<key>GetTechnology</key>", "\t<string>GetTechnology</string>",
-                                           "</dict>"}),
-                                 &error);
+    const auto value = parseText(
+        document({"<dict>", "\t<key>GetTechnology</key>", "\t<string>GetTechnology</string>", "</dict>"}),
+        &error);
     ASSERT_TRUE(value) << error;
     EXPECT_EQ(*value, dictionaryOf({{"GetTechnology", "GetTechnology"}}));
 }
@@ -311,22 +318,23 @@ TEST(PlistXmlReader, RoundTripsEveryKind) {
 }
 
 TEST(PlistXmlReader, KeepsDictionaryOrder) {
-    const auto value =
-        parseText("<plist><dict><key>zeta</key><integer>1</integer><key>alpha</key><integer>2</integer>"
-                  "<key>mid</key><integer>3</integer></dict></plist>");
+    const auto value = parseText(
+        "<plist><dict><key>zeta</key><integer>1</integer><key>alpha</key><integer>2</integer>"
+        "<key>mid</key><integer>3</integer></dict></plist>");
     ASSERT_TRUE(value && value->isDictionary());
     const auto& entries = value->dictionary()->entries();
     ASSERT_EQ(entries.size(), 3u);
     EXPECT_EQ(entries[0].first, "zeta");
     EXPECT_EQ(entries[1].first, "alpha");
     EXPECT_EQ(entries[2].first, "mid");
-    EXPECT_EQ(xmlOf(*value), document({"<dict>", "\t<key>zeta</key>", "\t<integer>1</integer>", "\t<key>alpha</key>",
-                                       "\t<integer>2</integer>", "\t<key>mid</key>", "\t<integer>3</integer>",
-                                       "</dict>"}));
+    EXPECT_EQ(xmlOf(*value),
+              document({"<dict>", "\t<key>zeta</key>", "\t<integer>1</integer>", "\t<key>alpha</key>",
+                        "\t<integer>2</integer>", "\t<key>mid</key>", "\t<integer>3</integer>", "</dict>"}));
 }
 
 TEST(PlistXmlReader, AcceptsByteOrderMarkLeadingSpaceAndBareRoot) {
-    const auto withMark = parseText("\xEF\xBB\xBF\n  <?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<plist><true/></plist>");
+    const auto withMark =
+        parseText("\xEF\xBB\xBF\n  <?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<plist><true/></plist>");
     ASSERT_TRUE(withMark);
     EXPECT_EQ(*withMark, PlistValue::boolean(true));
     const auto bare = parseText("<dict><key>a</key><array><false/></array></dict>");
@@ -367,8 +375,14 @@ TEST(PlistXmlReader, ReadsRealForms) {
         const char* text;
         double value;
     } cases[] = {
-        {"1.5", 1.5}, {"-2", -2.0}, {"+0.25", 0.25}, {"1e3", 1000.0}, {" 6.02E23 ", 6.02e23}, {".5", 0.5},
-        {"inf", std::numeric_limits<double>::infinity()}, {"-inf", -std::numeric_limits<double>::infinity()},
+        {"1.5", 1.5},
+        {"-2", -2.0},
+        {"+0.25", 0.25},
+        {"1e3", 1000.0},
+        {" 6.02E23 ", 6.02e23},
+        {".5", 0.5},
+        {"inf", std::numeric_limits<double>::infinity()},
+        {"-inf", -std::numeric_limits<double>::infinity()},
         {"+infinity", std::numeric_limits<double>::infinity()},
     };
     for (const auto& c : cases) {
@@ -427,7 +441,8 @@ TEST(PlistXmlReader, ReadsEscapesReferencesCdataAndComments) {
 
 TEST(PlistXmlReader, ReadsOtherDocumentEncodings) {
     // Latin-1 text comes back as UTF-8.
-    const auto latin = parseText("<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?><plist><string>caf\xE9</string></plist>");
+    const auto latin =
+        parseText("<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?><plist><string>caf\xE9</string></plist>");
     ASSERT_TRUE(latin);
     EXPECT_EQ(*latin->string(), "caf\xC3\xA9");
     // UTF-16 with a byte-order mark.
@@ -443,7 +458,8 @@ TEST(PlistXmlReader, ReadsOtherDocumentEncodings) {
 
 TEST(PlistXmlReader, LaterDuplicateKeyReplacesValueInPlace) {
     const auto value = parseText(
-        "<dict><key>a</key><integer>1</integer><key>b</key><integer>2</integer><key>a</key><integer>3</integer>"
+        "<dict><key>a</key><integer>1</integer><key>b</key><integer>2</integer><key>a</key><integer>3</"
+        "integer>"
         "</dict>");
     ASSERT_TRUE(value);
     EXPECT_EQ(*value, dictionaryOf({{"a", PlistValue::integer(3)}, {"b", PlistValue::integer(2)}}));
@@ -451,7 +467,8 @@ TEST(PlistXmlReader, LaterDuplicateKeyReplacesValueInPlace) {
 
 TEST(PlistXmlReader, ReportsTheLineOfTheProblem) {
     std::string error;
-    EXPECT_FALSE(parseText(document({"<dict>", "\t<key>n</key>", "\t<integer>12x</integer>", "</dict>"}), &error));
+    EXPECT_FALSE(
+        parseText(document({"<dict>", "\t<key>n</key>", "\t<integer>12x</integer>", "</dict>"}), &error));
     EXPECT_EQ(error, "line 6: invalid or out-of-range integer '12x'");
     EXPECT_FALSE(parseText("\n\n<plist>\n<strin>x</strin></plist>", &error));
     EXPECT_EQ(error, "line 4: unknown element <strin>");

@@ -24,14 +24,14 @@ TemporaryDirectory::~TemporaryDirectory() {
 }
 
 std::string readWholeFile(const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
+    std::ifstream in(path, std::ifstream::binary);
     std::ostringstream out;
     out << in.rdbuf();
     return out.str();
 }
 
 void writeWholeFile(const std::string& path, const std::string& contents) {
-    std::ofstream out(path, std::ios::binary | std::ios::trunc);
+    std::ofstream out(path, std::ofstream::binary | std::ofstream::trunc);
     out << contents;
 }
 

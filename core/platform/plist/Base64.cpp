@@ -62,10 +62,10 @@ void appendBase64(std::string& out, std::span<const std::uint8_t> bytes) {
 std::optional<std::vector<std::uint8_t>> decodeBase64(std::string_view text) {
     std::vector<std::uint8_t> out;
     out.reserve(text.size() / 4 * 3);
-    std::uint32_t quad = 0;    // the six-bit groups gathered so far
-    int filled = 0;            // how many of the current four places are taken
-    int padding = 0;           // '=' seen in the current group
-    bool finished = false;     // a padded group ended the data
+    std::uint32_t quad = 0;  // the six-bit groups gathered so far
+    int filled = 0;          // how many of the current four places are taken
+    int padding = 0;         // '=' seen in the current group
+    bool finished = false;   // a padded group ended the data
     for (const char c : text) {
         const std::uint8_t code = kDecode[static_cast<unsigned char>(c)];
         if (code == kSpace) {

@@ -30,7 +30,9 @@ CivilDate civilFromDays(std::int64_t days) {
     return {year, month, day};
 }
 
-bool isLeapYear(std::int64_t year) { return year % 4 == 0 && (year % 100 != 0 || year % 400 == 0); }
+bool isLeapYear(std::int64_t year) {
+    return year % 4 == 0 && (year % 100 != 0 || year % 400 == 0);
+}
 
 unsigned daysInMonth(std::int64_t year, unsigned month) {
     static constexpr unsigned kDays[12] = {31, 28, 31, 30, 31, 30, 31, 31, 30, 31, 30, 31};
@@ -79,10 +81,10 @@ std::optional<double> parseIso8601Utc(std::string_view text) {
     unsigned hour = 0;
     unsigned minute = 0;
     unsigned second = 0;
-    if (text.size() < 20 || !readDigits(text, 0, 4, year) || text[4] != '-' || !readDigits(text, 5, 2, month) ||
-        text[7] != '-' || !readDigits(text, 8, 2, day) || text[10] != 'T' || !readDigits(text, 11, 2, hour) ||
-        text[13] != ':' || !readDigits(text, 14, 2, minute) || text[16] != ':' ||
-        !readDigits(text, 17, 2, second)) {
+    if (text.size() < 20 || !readDigits(text, 0, 4, year) || text[4] != '-' ||
+        !readDigits(text, 5, 2, month) || text[7] != '-' || !readDigits(text, 8, 2, day) || text[10] != 'T' ||
+        !readDigits(text, 11, 2, hour) || text[13] != ':' || !readDigits(text, 14, 2, minute) ||
+        text[16] != ':' || !readDigits(text, 17, 2, second)) {
         return std::nullopt;
     }
     if (month < 1 || month > 12 || day < 1 || day > daysInMonth(year, month) || hour > 23 || minute > 59 ||
@@ -109,8 +111,8 @@ std::optional<double> parseIso8601Utc(std::string_view text) {
     if (at + 1 != text.size() || text[at] != 'Z') {
         return std::nullopt;
     }
-    const std::int64_t seconds = daysFromCivil(year, month, day) * kSecondsPerDay + hour * 3600 + minute * 60 +
-                                 static_cast<std::int64_t>(second);
+    const std::int64_t seconds = daysFromCivil(year, month, day) * kSecondsPerDay + hour * 3600 +
+                                 minute * 60 + static_cast<std::int64_t>(second);
     return static_cast<double>(seconds) + fraction;
 }
 

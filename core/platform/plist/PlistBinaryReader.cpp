@@ -42,7 +42,7 @@ constexpr std::uint64_t kValueAllowance = 1 << 16;
 constexpr std::uint64_t kByteAllowance = 1 << 20;
 
 class BinaryReader {
-public:
+  public:
     explicit BinaryReader(std::span<const std::uint8_t> bytes) : bytes_(bytes) {}
 
     std::optional<PlistValue> parse(std::string* error) {
@@ -62,7 +62,7 @@ public:
         return result;
     }
 
-private:
+  private:
     bool fail(std::size_t offset, std::string message) {
         errorOffset_ = offset;
         message_ = std::move(message);
@@ -71,7 +71,8 @@ private:
 
     // Reads an unsigned big-endian number of width bytes (1..8) at position; false when it does not fit
     // before limit.
-    bool readUnsigned(std::size_t position, std::size_t width, std::size_t limit, std::uint64_t& value) const {
+    bool readUnsigned(std::size_t position, std::size_t width, std::size_t limit,
+                      std::uint64_t& value) const {
         if (position > limit || width > limit - position) {
             return false;
         }
@@ -111,7 +112,8 @@ private:
             return fail(trailer + 24, "offset table position " + std::to_string(table) + " out of range");
         }
         if (count > (trailer - table) / offsetWidth_) {
-            return fail(trailer + 8, "object count " + std::to_string(count) + " does not fit the offset table");
+            return fail(trailer + 8,
+                        "object count " + std::to_string(count) + " does not fit the offset table");
         }
         objectCount_ = static_cast<std::size_t>(count);
         topObject_ = static_cast<std::size_t>(top);
@@ -188,7 +190,8 @@ private:
                     out = PlistValue::boolean(marker == 0x09);
                     return true;
                 }
-                return fail(start, marker == 0 ? std::string("null object") : "unknown object marker " + hex(marker));
+                return fail(
+                    start, marker == 0 ? std::string("null object") : "unknown object marker " + hex(marker));
             case 0x1:
                 return decodeInteger(start, out);
             case 0x2:
@@ -218,7 +221,8 @@ private:
             // A 128-bit two's-complement number: accepted only when it is an int64 written long.
             std::uint64_t high = 0;
             std::uint64_t low = 0;
-            if (!readUnsigned(start + 1, 8, objectsEnd_, high) || !readUnsigned(start + 9, 8, objectsEnd_, low)) {
+            if (!readUnsigned(start + 1, 8, objectsEnd_, high) ||
+                !readUnsigned(start + 9, 8, objectsEnd_, low)) {
                 return fail(start, "truncated integer");
             }
             const bool negative = (low >> 63) != 0;

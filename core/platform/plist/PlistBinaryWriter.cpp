@@ -31,7 +31,7 @@ std::size_t widthFor(std::uint64_t value) {
 }
 
 class BinaryWriter {
-public:
+  public:
     std::optional<PlistData> write(const PlistValue& root) {
         std::size_t rootIndex = 0;
         if (!collect(root, 0, rootIndex)) {
@@ -65,7 +65,7 @@ public:
         return std::move(out_);
     }
 
-private:
+  private:
     // One object to write: a value, or a dictionary key. Containers own refCount entries of refs_ from
     // firstRef on (a dictionary's keys, then its values).
     struct Node {
@@ -204,7 +204,8 @@ private:
                 return false;
             case PlistValue::Kind::Dictionary:
             case PlistValue::Kind::Array:
-                putMarker(value.isDictionary() ? 0xD : 0xA, value.isDictionary() ? node.refCount / 2 : node.refCount);
+                putMarker(value.isDictionary() ? 0xD : 0xA,
+                          value.isDictionary() ? node.refCount / 2 : node.refCount);
                 for (std::size_t i = 0; i < node.refCount; ++i) {
                     putUnsigned(refs_[node.firstRef + i], refWidth_);
                 }

@@ -2,8 +2,11 @@
 //
 // Contract:
 // - serializeXml writes the XML encoding (version "1.0", tab indentation, the standard header and document
-//   type). It fails (nullopt), never producing a partial document, when the value is not a property list:
-//   a none value anywhere, or a string or key that is not valid UTF-8.
+//   type; data as base64 lines of at most 76 characters; dates to the whole second). It fails (nullopt), never
+//   producing a partial document, when the value is not a property list XML can carry: a none value
+//   anywhere, a string or key that is not valid UTF-8 or holds a character XML cannot carry (control
+//   characters other than tab, line feed and carriage return; U+FFFE, U+FFFF), a date outside the years
+//   0000 to 9999, or nesting deeper than kMaxPlistDepth (which also stops a tree that contains itself).
 // - writeXmlFile writes that encoding straight to the path (no temporary file, not atomic); false on failure.
 // - parsePropertyList detects the encoding itself (XML, or binary "bplist00") and returns an immutable-by-
 //   convention tree. It is safe on hostile input: no entity expansion, no external entities, nesting limited

@@ -141,9 +141,10 @@ bool PlistValue::operator==(const PlistValue& other) const {
     }
 }
 
-PlistValue PlistDictionary::get(std::string_view key) const {
+const PlistValue& PlistDictionary::get(std::string_view key) const {
+    static const PlistValue kNone;
     const PlistValue* found = find(key);
-    return found ? *found : PlistValue();
+    return found ? *found : kNone;
 }
 
 PlistArrayRef PlistArray::create(std::vector<PlistValue> items) {

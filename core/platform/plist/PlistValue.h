@@ -105,8 +105,9 @@ public:
     bool empty() const { return map_.empty(); }
     // The stored value, or null when the key is absent.
     const PlistValue* find(std::string_view key) const { return map_.find(key); }
-    // The stored value, or none when the key is absent.
-    PlistValue get(std::string_view key) const;
+    // The stored value, or a none value when the key is absent. The reference stays valid until the
+    // dictionary changes.
+    const PlistValue& get(std::string_view key) const;
     bool contains(std::string_view key) const { return map_.contains(key); }
     void set(std::string_view key, PlistValue value) { map_.set(key, std::move(value)); }
     bool remove(std::string_view key) { return map_.remove(key); }

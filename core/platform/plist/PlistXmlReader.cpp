@@ -15,6 +15,7 @@
 #include <climits>
 #include <cstdint>
 #include <exception>
+#include <iterator>
 #include <optional>
 #include <span>
 #include <string>
@@ -33,7 +34,20 @@ std::optional<PlistValue> parseXmlPropertyList(std::span<const std::uint8_t> byt
 
 namespace {
 
-enum class Element : std::uint8_t { Plist, Dict, Array, Key, String, Integer, Real, True, False, Data, Date, Unknown };
+enum class Element : std::uint8_t {
+    Plist,
+    Dict,
+    Array,
+    Key,
+    String,
+    Integer,
+    Real,
+    True,
+    False,
+    Data,
+    Date,
+    Unknown
+};
 
 Element classify(std::string_view name) {
     switch (name.size()) {
@@ -91,7 +105,9 @@ bool collectsText(Element element) {
     }
 }
 
-bool isXmlSpace(char c) { return c == ' ' || c == '\t' || c == '\n' || c == '\r'; }
+bool isXmlSpace(char c) {
+    return c == ' ' || c == '\t' || c == '\n' || c == '\r';
+}
 
 std::string_view trimXmlSpace(std::string_view text) {
     while (!text.empty() && isXmlSpace(text.front())) {
@@ -103,10 +119,11 @@ std::string_view trimXmlSpace(std::string_view text) {
     return text;
 }
 
-// A short, single-line, printable rendering of document text for an error message.
-std::string quoted(std::string_view text) {
+// A short, single-line rendering of document text for an error message: printable ASCII is kept, anything
+// else shows as '?', and long text is cut.
+std::string printable(std::string_view text) {
     constexpr std::size_t kLimit = 40;
-    std::string out = "'";
+    std::string out;
     for (std::size_t i = 0; i < text.size() && i < kLimit; ++i) {
         const auto c = static_cast<unsigned char>(text[i]);
         out.push_back(c >= 0x20 && c < 0x7F ? static_cast<char>(c) : '?');
@@ -114,8 +131,11 @@ std::string quoted(std::string_view text) {
     if (text.size() > kLimit) {
         out.append("...");
     }
-    out.push_back('\'');
     return out;
+}
+
+std::string quoted(std::string_view text) {
+    return "'" + printable(text) + "'";
 }
 
 std::optional<std::int64_t> parseInteger(std::string_view text) {
@@ -175,15 +195,19 @@ std::optional<double> parseReal(std::string_view text) {
     return value;
 }
 
-struct Frame {
-    Element element;
-    PlistValue container;             // the dictionary or array being filled
-    std::string key;                  // a dictionary's key waiting for its value
-    bool hasKey = false;              // dictionary: key holds a key; plist: the value was seen
+// One open <plist>, <dict> or <array>. Levels are kept and reused as the parser goes up and down, so the
+// vectors that gather a container's children keep their capacity from one container to the next and each
+// finished container is built once, at its exact size.
+struct Level {
+    Element element = Element::Plist;
+    std::vector<PlistDictionary::Entry> entries;  // a dictionary's children
+    std::vector<PlistValue> items;                // an array's children, or the value of a <plist>
+    std::string key;                              // a dictionary's key waiting for its value
+    bool hasKey = false;
 };
 
 class XmlReader {
-public:
+  public:
     XmlReader() : parser_(XML_ParserCreate(nullptr)) {}
     ~XmlReader() {
         if (parser_ != nullptr) {
@@ -227,14 +251,14 @@ public:
             const XML_LChar* text = XML_ErrorString(XML_GetErrorCode(parser_));
             return report(error, line + skippedLines, text != nullptr ? text : "malformed XML");
         }
-        if (!result_ || !stack_.empty()) {
+        if (!result_ || depth_ != 0) {
             return report(error, static_cast<unsigned long>(XML_GetCurrentLineNumber(parser_)) + skippedLines,
                           "no property-list value in the document");
         }
         return std::move(result_);
     }
 
-private:
+  private:
     static std::optional<PlistValue> report(std::string* error, unsigned long line, std::string_view what) {
         if (error != nullptr) {
             *error = "line " + std::to_string(line) + ": " + std::string(what);
@@ -291,104 +315,136 @@ private:
         guarded(userData, [name](XmlReader& self) { self.fail("entity declaration " + quoted(name)); });
     }
     static void XMLCALL onSkippedEntity(void* userData, const XML_Char* name, int /*isParameterEntity*/) {
-        guarded(userData, [name](XmlReader& self) { self.fail("reference to undeclared entity " + quoted(name)); });
+        guarded(userData,
+                [name](XmlReader& self) { self.fail("reference to undeclared entity " + quoted(name)); });
     }
-    static int XMLCALL onExternalEntity(XML_Parser parser, const XML_Char* /*context*/, const XML_Char* /*base*/,
-                                        const XML_Char* systemId, const XML_Char* /*publicId*/) {
+    static int XMLCALL onExternalEntity(XML_Parser parser, const XML_Char* /*context*/,
+                                        const XML_Char* /*base*/, const XML_Char* systemId,
+                                        const XML_Char* /*publicId*/) {
         guarded(XML_GetUserData(parser), [systemId](XmlReader& self) {
             self.fail("external entity " + quoted(systemId != nullptr ? systemId : "") + " is not loaded");
         });
         return XML_STATUS_ERROR;
     }
 
+    Level* top() { return depth_ == 0 ? nullptr : &levels_[depth_ - 1]; }
+
     void startElement(std::string_view name) {
         const Element element = classify(name);
         if (element == Element::Unknown) {
-            return fail("unknown element <" + std::string(name.substr(0, 40)) + ">");
+            return fail("unknown element <" + printable(name) + ">");
         }
-        if (stack_.empty()) {
-            if (element == Element::Key) {
-                return fail("<key> outside a dictionary");
+        if (scalar_ != Element::Unknown) {
+            return fail("element <" + std::string(name) + "> inside <" + elementName(scalar_) + ">");
+        }
+        if (Level* parent = top()) {
+            if (element == Element::Plist) {
+                return fail(parent->element == Element::Plist ? "<plist> inside <plist>"
+                                                              : "<plist> inside a value");
             }
-        } else {
-            Frame& parent = stack_.back();
-            switch (parent.element) {
+            switch (parent->element) {
                 case Element::Plist:
-                    if (element == Element::Plist) {
-                        return fail("<plist> inside <plist>");
-                    }
                     if (element == Element::Key) {
                         return fail("<key> outside a dictionary");
                     }
-                    if (parent.hasKey) {
+                    if (!parent->items.empty()) {
                         return fail("more than one value in <plist>");
                     }
                     break;
                 case Element::Dict:
-                    if (!parent.hasKey && element != Element::Key) {
+                    if (!parent->hasKey && element != Element::Key) {
                         return fail("expected <key> in <dict>, found <" + std::string(name) + ">");
                     }
-                    if (parent.hasKey && element == Element::Key) {
-                        return fail("key " + quoted(parent.key) + " has no value");
-                    }
-                    if (element == Element::Plist) {
-                        return fail("<plist> inside a value");
-                    }
-                    break;
-                case Element::Array:
-                    if (element == Element::Key) {
-                        return fail("<key> outside a dictionary");
-                    }
-                    if (element == Element::Plist) {
-                        return fail("<plist> inside a value");
+                    if (parent->hasKey && element == Element::Key) {
+                        return fail("key " + quoted(parent->key) + " has no value");
                     }
                     break;
                 default:
-                    return fail("element <" + std::string(name) + "> inside <" + elementName(parent.element) + ">");
+                    if (element == Element::Key) {
+                        return fail("<key> outside a dictionary");
+                    }
+                    break;
             }
+        } else if (element == Element::Key) {
+            return fail("<key> outside a dictionary");
         }
-        Frame frame{element, PlistValue(), std::string(), false};
-        if (element == Element::Dict || element == Element::Array) {
-            if (++depth_ > static_cast<std::size_t>(kMaxPlistDepth)) {
+
+        if (element == Element::Dict || element == Element::Array || element == Element::Plist) {
+            if (element != Element::Plist && ++containerDepth_ > static_cast<std::size_t>(kMaxPlistDepth)) {
                 return fail("containers nested deeper than " + std::to_string(kMaxPlistDepth) + " levels");
             }
-            frame.container = element == Element::Dict ? PlistValue::newDictionary() : PlistValue::newArray();
-        } else if (collectsText(element)) {
-            text_.clear();
+            if (depth_ == levels_.size()) {
+                levels_.emplace_back();
+            }
+            Level& level = levels_[depth_++];
+            level.element = element;
+            level.entries.clear();
+            level.items.clear();
+            level.hasKey = false;
+            return;
         }
-        stack_.push_back(std::move(frame));
+        scalar_ = element;
+        text_.clear();
     }
 
     void endElement() {
-        Frame frame = std::move(stack_.back());
-        stack_.pop_back();
-        switch (frame.element) {
+        if (scalar_ != Element::Unknown) {
+            const Element element = scalar_;
+            scalar_ = Element::Unknown;
+            return endScalar(element);
+        }
+        Level& level = levels_[--depth_];
+        switch (level.element) {
             case Element::Plist:
-                if (!frame.hasKey) {
+                if (level.items.empty()) {
                     return fail("<plist> holds no value");
                 }
+                result_ = std::move(level.items.front());
+                level.items.clear();
                 return;
-            case Element::Dict:
-                if (frame.hasKey) {
-                    return fail("key " + quoted(frame.key) + " has no value");
+            case Element::Dict: {
+                if (level.hasKey) {
+                    return fail("key " + quoted(level.key) + " has no value");
                 }
-                --depth_;
-                return attach(std::move(frame.container));
-            case Element::Array:
-                --depth_;
-                return attach(std::move(frame.container));
-            case Element::Key:
+                --containerDepth_;
+                auto dictionary = PlistDictionary::create();
+                dictionary->reserve(level.entries.size());
+                for (auto& [key, value] : level.entries) {
+                    dictionary->set(key, std::move(value));
+                }
+                level.entries.clear();
+                return attach(PlistValue(std::move(dictionary)));
+            }
+            case Element::Array: {
+                --containerDepth_;
+                auto array =
+                    PlistArray::create(std::vector<PlistValue>(std::make_move_iterator(level.items.begin()),
+                                                               std::make_move_iterator(level.items.end())));
+                level.items.clear();
+                return attach(PlistValue(std::move(array)));
+            }
+            default:
+                return;
+        }
+    }
+
+    void endScalar(Element element) {
+        switch (element) {
+            case Element::Key: {
                 if (!isValidUtf8(text_)) {
                     return fail("key is not valid UTF-8");
                 }
-                stack_.back().key = std::move(text_);
-                stack_.back().hasKey = true;
+                Level& dictionary = *top();
+                dictionary.key.assign(text_);
+                dictionary.hasKey = true;
                 return;
+            }
             case Element::String:
                 if (!isValidUtf8(text_)) {
                     return fail("string is not valid UTF-8");
                 }
-                return attach(PlistValue(std::move(text_)));
+                // A copy rather than a move, so that text_ keeps its capacity for the next value.
+                return attach(PlistValue(std::string_view(text_)));
             case Element::Integer: {
                 const auto number = parseInteger(text_);
                 if (!number) {
@@ -421,59 +477,51 @@ private:
                 }
                 return attach(PlistValue::date(PlistDate{*seconds}));
             }
-            case Element::Unknown:
+            default:
                 return;
         }
     }
 
     void attach(PlistValue value) {
-        if (stack_.empty()) {
-            result_ = std::move(value);
-            return;
-        }
-        Frame& parent = stack_.back();
-        switch (parent.element) {
-            case Element::Plist:
-                parent.hasKey = true;
-                result_ = std::move(value);
-                return;
-            case Element::Array:
-                parent.container.array()->append(std::move(value));
-                return;
-            case Element::Dict:
-                parent.container.dictionary()->set(parent.key, std::move(value));
-                parent.hasKey = false;
-                return;
-            default:
-                return fail("value inside <" + elementName(parent.element) + ">");
+        Level* parent = top();
+        if (parent == nullptr) {
+            result_ = std::move(value);  // a bare value as the document element
+        } else if (parent->element == Element::Dict) {
+            parent->entries.emplace_back(parent->key, std::move(value));
+            parent->hasKey = false;
+        } else {
+            parent->items.push_back(std::move(value));
         }
     }
 
     void characters(std::string_view text) {
-        if (!stack_.empty() && collectsText(stack_.back().element)) {
+        if (collectsText(scalar_)) {
             text_.append(text);
             return;
         }
         for (const char c : text) {
             if (!isXmlSpace(c)) {
-                return fail(stack_.empty() ? std::string("text outside the document element")
-                                           : "unexpected text " + quoted(text) + " in <" +
-                                                 elementName(stack_.back().element) + ">");
+                const Element where = scalar_ != Element::Unknown ? scalar_
+                                      : top()                     ? top()->element
+                                                                  : Element::Plist;
+                return fail("unexpected text " + quoted(text) + " in <" + elementName(where) + ">");
             }
         }
     }
 
     static std::string elementName(Element element) {
-        static constexpr std::string_view kNames[] = {"plist", "dict",  "array", "key",  "string", "integer",
-                                                      "real",  "true",  "false", "data", "date",   "?"};
+        static constexpr std::string_view kNames[] = {"plist", "dict", "array", "key",  "string", "integer",
+                                                      "real",  "true", "false", "data", "date",   "?"};
         return std::string(kNames[static_cast<std::size_t>(element)]);
     }
 
     XML_Parser parser_;
-    std::vector<Frame> stack_;
+    std::vector<Level> levels_;  // levels_[0, depth_) are open
+    std::size_t depth_ = 0;
+    std::size_t containerDepth_ = 0;     // open dictionaries and arrays
+    Element scalar_ = Element::Unknown;  // the open value element that is not a container, if any
     std::string text_;
     std::optional<PlistValue> result_;
-    std::size_t depth_ = 0;
     bool failed_ = false;
     unsigned long failedLine_ = 0;
     std::string message_;
@@ -491,7 +539,8 @@ std::optional<PlistValue> parseXmlPropertyList(std::span<const std::uint8_t> byt
     unsigned long skippedLines = 0;
     while (start < bytes.size() && isXmlSpace(static_cast<char>(bytes[start]))) {
         const bool lineEnd =
-            bytes[start] == '\n' || (bytes[start] == '\r' && (start + 1 == bytes.size() || bytes[start + 1] != '\n'));
+            bytes[start] == '\n' ||
+            (bytes[start] == '\r' && (start + 1 == bytes.size() || bytes[start + 1] != '\n'));
         skippedLines += lineEnd ? 1 : 0;
         ++start;
     }

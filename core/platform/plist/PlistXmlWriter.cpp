@@ -57,7 +57,7 @@ constexpr std::array<std::uint8_t, 256> makeByteClasses() {
 constexpr std::array<std::uint8_t, 256> kByteClass = makeByteClasses();
 
 class XmlWriter {
-public:
+  public:
     explicit XmlWriter(std::string& out) : out_(out) {}
 
     bool writeValue(const PlistValue& value, std::size_t level) {
@@ -112,7 +112,7 @@ public:
         return false;
     }
 
-private:
+  private:
     void indent(std::size_t level) { out_.append(level, '\t'); }
 
     bool enter() { return ++depth_ <= static_cast<std::size_t>(kMaxPlistDepth); }

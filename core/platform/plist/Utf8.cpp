@@ -7,7 +7,9 @@ namespace velmar {
 
 namespace {
 
-bool isContinuation(unsigned char byte) { return (byte & 0xC0U) == 0x80U; }
+bool isContinuation(unsigned char byte) {
+    return (byte & 0xC0U) == 0x80U;
+}
 
 // True when none of the eight bytes at p has its top bit set.
 bool eightAscii(const char* p) {

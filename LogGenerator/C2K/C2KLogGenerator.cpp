@@ -1,0 +1,138 @@
+#include "LogGenerator/C2K/C2KLogGenerator.h"
+
+#include "LogGenerator/C2K/C2KLogCodes.h"
+#include "LogGenerator/C2K/C2KLogParsers.h"
+#include "LogGenerator/C2K/C2KSortedPilots.h"
+#include "LogGenerator/C2K/C2KStateKeys.h"
+#include "LogGenerator/StateKeys.h"
+#include "core/platform/Resources.h"
+#include "core/platform/SystemLog.h"
+#include "core/platform/plist/PlistCodec.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr const char* kTemplateName = "C2KTemplate";
+constexpr std::size_t kMinimumBlobLength = 13;
+constexpr std::uint8_t kChannelPrefixMarker = 0x81;
+constexpr std::size_t kChannelPrefixLength = 2;
+constexpr std::uint8_t kPlainLogType = 1;
+constexpr std::uint8_t kExtendedLogType = 0xFF;
+constexpr std::int32_t kExtendedCodeBase = 0xFF0000;
+
+}  // namespace
+
+std::unique_ptr<LogGenerator> C2KLogGenerator::generator() {
+    return std::make_unique<C2KLogGenerator>();
+}
+
+void C2KLogGenerator::processTemplate(const PlistDictionary& templateDictionary,
+                                      const PlistDictionaryRef& storeDisplayIntoDict,
+                                      PlistDictionary& storeLookupIntoDict) {
+    for (const auto& [label, value] : templateDictionary) {
+        if (const PlistDictionaryRef& group = value.dictionary()) {
+            auto displayGroup = PlistDictionary::create();
+            processTemplate(*group, displayGroup, storeLookupIntoDict);
+            storeDisplayIntoDict->set(label, std::move(displayGroup));
+        } else if (const std::string* displayKey = value.string()) {
+            if (*displayKey == c2k::kSortedMarker) {
+                storeDisplayIntoDict->set(label, value);
+                continue;
+            }
+            storeDisplayIntoDict->set(label, PlistValue(""));
+            PlistArrayRef places = storeLookupIntoDict.get(*displayKey).array();
+            if (!places) {
+                places = PlistArray::create();
+                storeLookupIntoDict.set(*displayKey, places);
+            }
+            // The place shares the display dictionary that holds the label: values written through it show.
+            auto place = PlistDictionary::create();
+            place->set(c2k::kPlaceLabelKey, label);
+            place->set(c2k::kPlaceDictionaryKey, storeDisplayIntoDict);
+            places->append(std::move(place));
+        }
+    }
+    SystemLog::log(kLogWarning, "Processing the template");
+}
+
+PlistDictionaryRef C2KLogGenerator::getDisplayFromState(const StateDict& state) {
+    using namespace state_keys;
+    if (const PlistDictionaryRef display = state->get(kDisplay).dictionary()) {
+        if (state->get(c2k::kLookupKey).isDictionary()) {
+            return display;
+        }
+    }
+    PlistDictionaryRef templateDictionary = state->get(kTemplate).dictionary();
+    if (!templateDictionary) {
+        const auto path = Resources::pathForResource(kTemplateName, "plist");
+        const std::optional<PlistValue> loaded = path ? readDictionaryFile(*path) : std::nullopt;
+        if (!loaded || !loaded->isDictionary()) {
+            SystemLog::log(kLogError, "Cannot load C2K template for display");
+            return nullptr;
+        }
+        templateDictionary = loaded->dictionary();
+        state->set(kTemplate, *loaded);
+    }
+    auto display = PlistDictionary::create();
+    auto lookup = PlistDictionary::create();
+    processTemplate(*templateDictionary, display, *lookup);
+    state->set(kDisplay, display);
+    state->set(c2k::kLookupKey, std::move(lookup));
+    state->set(kExtraInfo, PlistValue::newDictionary());
+    return display;
+}
+
+void C2KLogGenerator::updateState(const StateDict& state, ByteView data) {
+    getDisplayFromState(state);
+    // Held here: parsers add entries to the state, which may move the entry that holds the lookup.
+    const PlistDictionaryRef lookup = state->get(c2k::kLookupKey).dictionary();
+    updateFromLog(data, lookup, state);
+}
+
+void C2KLogGenerator::updateFromLog(ByteView data, const PlistDictionaryRef& usingLookup,
+                                    const StateDict& usingState) {
+    // The length test is made before the prefix is cut, as the other generators make it.
+    if (data.size() < kMinimumBlobLength) {
+        return;
+    }
+    const ByteView packet = data[0] == kChannelPrefixMarker ? data.subspan(kChannelPrefixLength) : data;
+    const std::uint8_t logType = packet[0];
+    if (logType != kPlainLogType) {
+        // Logged only: the packet is processed all the same.
+        SystemLog::log(kLogError, "Invalid log type: %x. Dropping.", logType);
+    }
+    const RecordReader reader(packet);
+    std::int32_t code = static_cast<std::int32_t>(reader.u16(3));
+    if (logType == kExtendedLogType) {
+        code += kExtendedCodeBase;
+    }
+    const c2k::C2KLogParser parse = c2k::parserForCode(code);
+    if (parse == nullptr) {
+        return;
+    }
+    parse(reader, c2k::C2KRecordContext{usingLookup.get(), *usingState});
+    if (_binData) {
+        _binData->insert(_binData->end(), packet.begin(), packet.end());
+    }
+}
+
+PlistValue C2KLogGenerator::generateLogUsingState(const StateDict& state) {
+    state->set(state_keys::kDisplayState, PlistValue(takeBinData()));
+    LogGenerator::updateHistoryInState(state);
+    return state->get(state_keys::kDisplay);
+}
+
+PlistValue C2KLogGenerator::getStartCommand() {
+    auto codes = PlistArray::create();
+    codes->reserve(c2k::kStartCommandCodes.size());
+    for (const std::int32_t code : c2k::kStartCommandCodes) {
+        codes->append(PlistValue::integer(code));
+    }
+    auto command = PlistDictionary::create();
+    command->set("SetState", "Streaming");
+    command->set("SetOrvaneLogCodes", std::move(codes));
+    return command;
+}
+
+}  // namespace velmar

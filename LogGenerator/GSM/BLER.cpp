@@ -1,0 +1,59 @@
+#include "LogGenerator/GSM/BLER.h"
+
+#include "LogGenerator/GSM/CountedList.h"
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr gsm::RecordRule kRules[] = {
+    {0x4116, 16},
+};
+
+constexpr RecordField kWindowFields[] = {
+    u16Field(14, "Window Size"),
+};
+
+// One transport channel entry (9 bytes). The CRC counts are shown signed, so 0xFFFFFFFF reads -1.
+constexpr RecordField kTransportChannelFields[] = {
+    u8Field(0, "Transport Channel ID"),
+    u32Field(1, "CRC Received"),
+    u32Field(5, "CRC Received in Error"),
+};
+
+constexpr std::size_t kChannelCountOffset = 13;
+constexpr std::size_t kFirstEntryOffset = 16;
+constexpr std::size_t kEntryLength = 9;
+
+}  // namespace
+
+void BLER::updateWithData(ByteView data, std::int32_t logCode) {
+    if (gsm::admitRecord("BLER", kRules, data, logCode) == nullptr) {
+        return;
+    }
+    const RecordReader record(data);
+    const CountedList channels{kFirstEntryOffset, kEntryLength, record.u8(kChannelCountOffset)};
+    const PlistDictionaryRef section = sectionDictionary();
+    if (!section) {
+        return;
+    }
+    writeFields(kWindowFields, record, 0, *section);
+    // Stored even when empty: a record without channels clears the list shown before.
+    auto rows = PlistArray::create();
+    rows->reserve(channels.count);
+    for (std::size_t i = 0; i < channels.count; ++i) {
+        rows->append(rowFromFields(kTransportChannelFields, record, channels.elementOffset(i)));
+    }
+    section->set("Transport Channels", std::move(rows));
+}
+
+std::string_view BLER::getSectionName() const {
+    return "BLER";
+}
+
+LogCodeArray BLER::getLogCodeArray() const {
+    return gsm::codesOf(kRules);
+}
+
+}  // namespace velmar

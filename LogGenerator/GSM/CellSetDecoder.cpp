@@ -1,0 +1,61 @@
+#include "LogGenerator/GSM/CellSetDecoder.h"
+
+#include "LogGenerator/GSM/CellSetRecord.h"
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/RecordFields.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr gsm::RecordRule kRules[] = {
+    {kLogCodeUmtsCellSets, CellSetRecord::kMinimumLength},
+};
+
+// RSCP in dB: the received-power reading brought to dBm (division truncating toward zero), plus Ec/Io.
+int rscpOf(std::int32_t powerReading, int energyPerChip) {
+    return (powerReading + 512) / 10 - 106 + energyPerChip;
+}
+
+constexpr ValueFormat kScramblingCodeFormat = asInt("%d");
+constexpr ValueFormat kDecibelFormat = asInt("%d dB");
+
+PlistDictionaryRef activeCellRow(const CellSetRecord& record, std::size_t index,
+                                 const CellSetRecord::Cell& cell) {
+    const int energyPerChip = Base::lookUpECNO(record.energyReading(index));
+    auto row = PlistDictionary::create();
+    row->reserve(3);
+    row->set("Scrambling Code", kScramblingCodeFormat.render(cell.scramblingCode));
+    row->set("RSCP", kDecibelFormat.render(rscpOf(record.powerReading(), energyPerChip)));
+    row->set("Energy Per Chip", kDecibelFormat.render(energyPerChip));
+    return row;
+}
+
+}  // namespace
+
+void CellSetDecoder::updateWithData(ByteView data, std::int32_t logCode) {
+    if (gsm::admitRecord(title_, kRules, data, logCode) == nullptr) {
+        return;
+    }
+    const PlistArrayRef section = sectionArray();
+    clearElementsInArray(section);
+    const CellSetRecord record(data);
+    if (record.cellCount() == 0) {
+        return;
+    }
+    auto rows = PlistArray::create();
+    for (std::size_t i = 0; i < record.cellCount(); ++i) {
+        const CellSetRecord::Cell cell = record.cell(i);
+        if (listsActiveCells_ && cell.setType == CellSetRecord::kActiveSetType) {
+            rows->append(activeCellRow(record, i, cell));
+        }
+    }
+    replaceArray(section, rows);
+}
+
+LogCodeArray CellSetDecoder::getLogCodeArray() const {
+    return gsm::codesOf(kRules);
+}
+
+}  // namespace velmar

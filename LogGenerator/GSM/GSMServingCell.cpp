@@ -1,0 +1,74 @@
+#include "LogGenerator/GSM/GSMServingCell.h"
+
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "core/platform/KxServerProtocol.h"
+
+namespace velmar {
+
+namespace {
+
+using gsm::RecordRule;
+
+constexpr RecordField kIdentityFields[] = {
+    u16Field(17, "Cell ID"),
+    u16Field(13, "ARFCN"),
+    u16Field(15, "BSIC"),
+};
+
+// The raw RSSI byte is shown with its unit but without sign change or scaling; C1 and C2 are 32-bit fields of
+// which only the low 16 bits are shown.
+constexpr RecordField kMeasurementFields[] = {
+    u8Field(15, "RSSI", asInt("%d dBm")),
+    bitField(16, 4, 0, 15, "C1 Value"),
+    bitField(20, 4, 0, 15, "C2 Value"),
+};
+
+// Only the low byte of the 2-byte ARFCN is shown (0..255).
+constexpr RecordField kDedicatedChannelFields[] = {
+    bitField(13, 2, 0, 7, "MA Dedicated ARFCN"),
+};
+
+constexpr RecordRule kRules[] = {
+    {kLogCodeGsmServingIdentity, 26, kIdentityFields},
+    {kLogCodeGsmMeasurements, 29, kMeasurementFields},
+    {kLogCodeGsmDedicatedChannel, 17, kDedicatedChannelFields},
+    {gsm::kCellMonitorCode, 0},
+};
+
+void showServingCell(ByteView data, PlistDictionary* section) {
+    const PlistDictionaryRef cell =
+        gsm::firstMatchingCell(data, {kKxCellMonitorRadioAccessTechnologyGSM}, kKxCellMonitorCellTypeServing);
+    if (!cell) {
+        return;
+    }
+    gsm::writeCellNumber(*cell, kKxCellMonitorCellId, section, "Cell ID",
+                         "GSMServingCell: Failed to retrieve Cell ID\n");
+    gsm::writeCellNumber(*cell, kKxCellMonitorARFCN, section, "ARFCN",
+                         "GSMServingCell: Failed to retrieve ARFCN\n");
+}
+
+}  // namespace
+
+void GSMServingCell::updateWithData(ByteView data, std::int32_t logCode) {
+    const RecordRule* rule = gsm::admitRecord("GSMServingCell", kRules, data, logCode);
+    if (rule == nullptr) {
+        return;
+    }
+    const PlistDictionaryRef section = sectionDictionary();
+    if (rule->code == gsm::kCellMonitorCode) {
+        showServingCell(data, section.get());
+    } else {
+        gsm::writeRuleFields(*rule, data, section.get());
+    }
+}
+
+std::string_view GSMServingCell::getSectionName() const {
+    return "GSM Serving Cell";
+}
+
+LogCodeArray GSMServingCell::getLogCodeArray() const {
+    return gsm::codesOf(kRules);
+}
+
+}  // namespace velmar

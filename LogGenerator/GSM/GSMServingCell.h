@@ -1,0 +1,16 @@
+// GSMServingCell: the "GSM Serving Cell" key section: identity (0x5134), measurements (0x5137), the dedicated
+// channel's ARFCN (0x5076) and the GSM serving cell of the cell-monitor record (0xFF0001).
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+namespace velmar {
+
+class GSMServingCell : public Base {
+  public:
+    void updateWithData(ByteView data, std::int32_t logCode) override;
+    std::string_view getSectionName() const override;
+    LogCodeArray getLogCodeArray() const override;
+};
+
+}  // namespace velmar

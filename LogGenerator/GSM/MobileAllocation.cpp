@@ -1,0 +1,53 @@
+#include "LogGenerator/GSM/MobileAllocation.h"
+
+#include "LogGenerator/GSM/CountedList.h"
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/RecordFields.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr gsm::RecordRule kRules[] = {
+    {kLogCodeGsmMobileAllocation, 15},
+};
+
+constexpr RecordField kAllocationFields[] = {
+    u8Field(13, "HSN"),
+};
+
+// Count at 14; 2-byte ARFCNs from 15.
+constexpr std::size_t kArfcnCountOffset = 14;
+constexpr std::size_t kArfcnListOffset = 15;
+constexpr std::size_t kArfcnSize = 2;
+constexpr RecordField kArfcn = u16Field(0, "ARFCN");
+
+}  // namespace
+
+void MobileAllocation::updateWithData(ByteView data, std::int32_t logCode) {
+    if (gsm::admitRecord("MobileAllocation", kRules, data, logCode) == nullptr) {
+        return;
+    }
+    const RecordReader record(data);
+    const CountedList list{kArfcnListOffset, kArfcnSize, record.u8(kArfcnCountOffset)};
+    auto arfcns = PlistArray::create();
+    arfcns->reserve(list.count);
+    for (std::size_t i = 0; i < list.count; ++i) {
+        arfcns->append(kArfcn.format.render(kArfcn.read(record, list.elementOffset(i))));
+    }
+    if (const PlistDictionaryRef section = sectionDictionary()) {
+        writeFields(kAllocationFields, record, 0, *section);
+        section->set("ARFCNs", std::move(arfcns));
+    }
+}
+
+std::string_view MobileAllocation::getSectionName() const {
+    return "Mobile Allocation";
+}
+
+LogCodeArray MobileAllocation::getLogCodeArray() const {
+    return gsm::codesOf(kRules);
+}
+
+}  // namespace velmar

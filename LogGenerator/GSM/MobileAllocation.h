@@ -1,0 +1,19 @@
+// MobileAllocation: the "Mobile Allocation" key section: the hopping sequence number and the list of hopping
+// frequencies of record 0x51F8.
+//
+// Contract: "ARFCNs" holds an array of strings (not one string), written straight into the key section
+// without the array lock, as key sections are.
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+namespace velmar {
+
+class MobileAllocation : public Base {
+  public:
+    void updateWithData(ByteView data, std::int32_t logCode) override;
+    std::string_view getSectionName() const override;
+    LogCodeArray getLogCodeArray() const override;
+};
+
+}  // namespace velmar

@@ -1,0 +1,110 @@
+#include "LogGenerator/GSM/NeighboringCells.h"
+
+#include <iterator>
+
+#include "LogGenerator/GSM/CellMonitorWalk.h"
+#include "LogGenerator/GSM/CountedList.h"
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "core/platform/KxServerProtocol.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr gsm::RecordRule kRules[] = {
+    {kLogCodeGsmMeasurements, 29},
+    {kLogCodeGsmBsicList, 15},
+    {gsm::kCellMonitorCode, 0},
+};
+
+// 0x51FF: count at 14, 4-byte elements from 15: ARFCN (2 bytes), BSIC (1 byte), one unused byte.
+constexpr std::size_t kBsicCountOffset = 14;
+constexpr std::size_t kBsicListOffset = 15;
+constexpr std::size_t kBsicElementSize = 4;
+
+// 0x5137: count at 28, 14-byte neighbour elements from 29; bytes 7..13 of an element are not read.
+constexpr std::size_t kNeighbourCountOffset = 28;
+constexpr std::size_t kNeighbourListOffset = 29;
+constexpr std::size_t kNeighbourElementSize = 14;
+
+constexpr RecordField kNeighbourFields[] = {
+    u16Field(0, "ARFCN"),
+    u8Field(2, "RSSI"),
+    s32Field(3, "C1 Value"),
+};
+constexpr std::size_t kNeighbourArfcnOffset = 0;
+
+constexpr NeighbourCellField kNeighbourCellFields[] = {
+    {kKxCellMonitorARFCN, "ARFCN", asInt(), "NeighboringCells: Failed to retrieve ARFCN\n"},
+    {kKxCellMonitorRSSI, "RSSI", asInt("%d dBm", 2).withSentinel(kCellMonitorNoReading, ""),
+     "NeighboringCells: Failed to retrieve RSSI\n"},
+};
+
+}  // namespace
+
+void NeighboringCells::updateWithData(ByteView data, std::int32_t logCode) {
+    const gsm::RecordRule* rule = gsm::admitRecord("NeighboringCells", kRules, data, logCode);
+    if (rule == nullptr) {
+        return;
+    }
+    switch (rule->code) {
+        case kLogCodeGsmBsicList:
+            updateBsicList(data);
+            break;
+        case kLogCodeGsmMeasurements:
+            updateNeighbourMeasurements(data);
+            break;
+        case gsm::kCellMonitorCode:
+            showNeighbourCells(data, kKxCellMonitorRadioAccessTechnologyGSM, kNeighbourCellFields,
+                               sectionArray());
+            break;
+        default:
+            break;
+    }
+}
+
+void NeighboringCells::updateBsicList(ByteView data) {
+    const RecordReader record(data);
+    const CountedList list{kBsicListOffset, kBsicElementSize, record.u8(kBsicCountOffset)};
+    std::unordered_map<std::uint32_t, std::string> bsics;
+    for (std::size_t i = 0; i < list.count; ++i) {
+        const std::size_t at = list.elementOffset(i);
+        bsics.insert_or_assign(record.u16(at), std::to_string(record.u8(at + 2)));
+    }
+    arfcnToBsic = std::move(bsics);
+}
+
+void NeighboringCells::updateNeighbourMeasurements(ByteView data) {
+    const PlistArrayRef section = sectionArray();
+    clearElementsInArray(section);
+    const RecordReader record(data);
+    const CountedList list{kNeighbourListOffset, kNeighbourElementSize, record.u8(kNeighbourCountOffset)};
+    if (list.count == 0) {
+        return;
+    }
+    auto rows = PlistArray::create();
+    rows->reserve(list.count);
+    for (std::size_t i = 0; i < list.count; ++i) {
+        const std::size_t at = list.elementOffset(i);
+        auto row = PlistDictionary::create();
+        row->reserve(std::size(kNeighbourFields) + 1);
+        writeFields(kNeighbourFields, record, at, *row);
+        if (const auto bsic = arfcnToBsic.find(record.u16(at + kNeighbourArfcnOffset));
+            bsic != arfcnToBsic.end()) {
+            row->set("BSIC", bsic->second);
+        }
+        rows->append(std::move(row));
+    }
+    replaceArray(section, rows);
+}
+
+std::string_view NeighboringCells::getSectionName() const {
+    return "Neighboring Cells";
+}
+
+LogCodeArray NeighboringCells::getLogCodeArray() const {
+    return gsm::codesOf(kRules);
+}
+
+}  // namespace velmar

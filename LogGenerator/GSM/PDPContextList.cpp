@@ -1,0 +1,38 @@
+#include "LogGenerator/GSM/PDPContextList.h"
+
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "core/platform/plist/PlistCodec.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr std::size_t kRecordHeaderLength = 13;
+
+// The record's contexts when its property list is an array; null for any other root or unparsable data.
+PlistArrayRef parseContexts(ByteView record) {
+    const ByteView body =
+        record.size() > kRecordHeaderLength ? record.subspan(kRecordHeaderLength) : ByteView();
+    const std::optional<PlistValue> parsed = parsePropertyList(body);
+    return parsed ? parsed->array() : nullptr;
+}
+
+}  // namespace
+
+void PDPContextList::updateWithData(ByteView data, std::int32_t) {
+    gsm::logDecoderEntry("PDPContextList");
+    if (const PlistArrayRef contexts = parseContexts(data)) {
+        replaceArray(sectionArray(), contexts);
+    }
+}
+
+std::string_view PDPContextList::getSectionName() const {
+    return "PDP Context Info";
+}
+
+LogCodeArray PDPContextList::getLogCodeArray() const {
+    return std::vector<std::int32_t>{kLogCodePdpContexts};
+}
+
+}  // namespace velmar

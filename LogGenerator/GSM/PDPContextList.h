@@ -1,0 +1,20 @@
+// PDPContextList: the "PDP Context Info" list section, filled from the PDP-context extra record (0xFF0002)
+// that the telephony service supplies as a property-list array of context dictionaries. Every class index of
+// the log-code family creates one.
+//
+// Contract: a record whose property list is an array replaces the section's rows with its elements, as they
+// are; anything else (another root, unparsable data) leaves the rows unchanged, silently.
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+namespace velmar {
+
+class PDPContextList : public Base {
+  public:
+    void updateWithData(ByteView data, std::int32_t logCode) override;
+    std::string_view getSectionName() const override;
+    LogCodeArray getLogCodeArray() const override;
+};
+
+}  // namespace velmar

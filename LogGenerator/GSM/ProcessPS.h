@@ -1,0 +1,20 @@
+// ProcessPS: GSM/UMTS record decoder for packet-switched mobility state (GMM) from record 0x7130 and the
+// registration state from 0x7132; key section "Process PS".
+//
+// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
+// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
+// logic and logging but writes nowhere.
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+namespace velmar {
+
+class ProcessPS : public Base {
+  public:
+    void updateWithData(ByteView data, std::int32_t logCode) override;
+    std::string_view getSectionName() const override;
+    LogCodeArray getLogCodeArray() const override;
+};
+
+}  // namespace velmar

@@ -1,0 +1,61 @@
+#include "LogGenerator/GSM/SimInfo.h"
+
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/GSM/LogCode_0xFF0000.h"
+
+namespace velmar {
+
+namespace {
+
+struct SimFileKey {
+    const char* recordKey;
+    const char* displayKey;
+};
+
+constexpr SimFileKey kSimFiles[] = {
+    {"kSimFile_ICCID", "EF-ICCID"},
+    {"kSimFile_MSISDN", "EF-MSISDN"},
+    {"kSimFile_MBDN", "EF-3GPP MAIL BOX DIALING NUMBER"},
+    {"kSimFile_HPPLMN", "EF-HPPLMN SEARCH PERIOD"},
+    {"kSimFile_LOCI", "EF-LOCI"},
+    {"kSimFile_PSLOCI", "EF-GPRS/PS-LOCI"},
+    {"kSimFile_ACC", "EF-ACCESS CONTROL CLASS"},
+    {"kSimFile_AD", "EF-ADMINISTRATIVE DATA"},
+    {"kSimFile_FPLMN", "EF-FPLMN"},
+    {"kSimFile_AHPLMN", "EF-ACTING HPLMN"},
+    {"kSimFile_RATMODE", "EF-RAT MODE"},
+    {"kSimFile_PNN", "EF-PLMN NETWORK NAME"},
+    {"kSimFile_OPL", "EF-OPERATOR PLMN LIST"},
+    {"kSimFile_OPLMNAcT", "EF-OPLMNAcT"},
+};
+
+}  // namespace
+
+void SimInfo::updateWithData(ByteView data, std::int32_t logCode) {
+    gsm::logDecoderEntry("SimInfo");
+    if (logCode != kLogCodeSimFiles) {
+        return;
+    }
+    // Throws, before any key changes, when the record cannot be parsed.
+    const LogCode_0xFF0000::SimFileDictionary simFiles(data);
+    const PlistDictionaryRef section = sectionDictionary();
+    if (!section) {
+        return;
+    }
+    for (const SimFileKey& file : kSimFiles) {
+        if (const PlistValue* value = simFiles.files().find(file.recordKey)) {
+            section->set(file.displayKey, *value);
+        }
+    }
+}
+
+std::string_view SimInfo::getSectionName() const {
+    return "SIM Info";
+}
+
+LogCodeArray SimInfo::getLogCodeArray() const {
+    return std::vector<std::int32_t>{kLogCodeSimFiles};
+}
+
+}  // namespace velmar

@@ -1,0 +1,21 @@
+// SimInfo: the "SIM Info" key section, filled from the SIM-file extra record (0xFF0000) that the telephony
+// service supplies as a property-list dictionary. Every class index of the log-code family creates one.
+//
+// Contract: each known SIM-file record key that is present is copied, value unchanged, under its display key;
+// absent keys leave their display key as it was. A record that cannot be parsed logs "SIM File dictionary
+// data could not be constructed" and throws LogCode_0xFF0000::UnknownDataException before any key changes.
+// Other codes are ignored without a message.
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+namespace velmar {
+
+class SimInfo : public Base {
+  public:
+    void updateWithData(ByteView data, std::int32_t logCode) override;
+    std::string_view getSectionName() const override;
+    LogCodeArray getLogCodeArray() const override;
+};
+
+}  // namespace velmar

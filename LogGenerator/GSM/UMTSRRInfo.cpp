@@ -1,0 +1,126 @@
+#include "LogGenerator/GSM/UMTSRRInfo.h"
+
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "core/platform/KxServerProtocol.h"
+#include "core/platform/StringFormat.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr ValueName kRrcStateRows[] = {
+    {0, 0, "Disconnected"}, {1, 1, "Connecting"}, {2, 2, "CELL_FACH"},
+    {3, 3, "CELL_DCH"},     {4, 4, "CELL_PCH"},   {5, 5, "URA_PCH"},
+};
+constexpr ValueNames kRrcStateNames{kRrcStateRows, "Unknown"};
+
+constexpr ValueName kCipheringRows[] = {{0, 0, "Disabled"}};
+constexpr ValueNames kCipheringNames{kCipheringRows, "Enabled"};
+
+constexpr RecordField kRrcStateFields[] = {
+    u8Field(13, "RRC State", asName(kRrcStateNames)),
+};
+
+// 0x4127 up to the frequencies; "UARFCN" is removed after them and "URA ID" follows.
+constexpr RecordField kCellIdentityFields[] = {
+    s32Field(21, "Cell ID"),
+    s32Field(17, "Downlink Frequency"),
+    s32Field(13, "Uplink Frequency"),
+};
+constexpr RecordField kUraFields[] = {
+    u16Field(25, "URA ID"),
+};
+
+constexpr RecordField kCipheringFields[] = {
+    u8Field(13, "Ciphering", asName(kCipheringNames)),
+};
+
+constexpr std::int32_t kTransmitPowerCode = 0x4031;
+constexpr std::int32_t kCellIdentityCode = 0x4127;
+
+constexpr gsm::RecordRule kRules[] = {
+    {0x4125, 14, kRrcStateFields},  {kTransmitPowerCode, 16},   {kCellIdentityCode, 29},
+    {0x4157, 19, kCipheringFields}, {gsm::kCellMonitorCode, 0},
+};
+
+// 0x4031: the mean of the non-zero uplink power readings. With no such reading the mean is 0 / 0 and shows
+// as not-a-number; the display has always shown it so.
+void writeTransmitPower(ByteView data, PlistDictionary* section) {
+    constexpr std::size_t kCountOffset = 14;
+    constexpr std::size_t kFirstEntryOffset = 16;
+    constexpr std::size_t kEntryLength = 14;
+    constexpr std::size_t kReadingOffset = 4;
+    const RecordReader record(data);
+    const std::size_t entries = record.u8(kCountOffset);
+    double sum = 0;
+    int counted = 0;
+    for (std::size_t entry = 0; entry < entries; ++entry) {
+        const int reading = record.s16(kFirstEntryOffset + kEntryLength * entry + kReadingOffset);
+        if (reading != 0) {
+            sum += (reading + 512) / 10 - 70;  // integer division, toward zero
+            ++counted;
+        }
+    }
+    if (section != nullptr) {
+        section->set("Transmit Power", stringWithFormat("%4.2lf dBm", sum / counted));
+    }
+}
+
+void writeCellIdentity(ByteView data, PlistDictionary* section) {
+    if (section == nullptr) {
+        return;
+    }
+    const RecordReader record(data);
+    writeFields(kCellIdentityFields, record, 0, *section);
+    // This record's frequencies replace the UARFCN that cell information wrote.
+    section->remove("UARFCN");
+    writeFields(kUraFields, record, 0, *section);
+}
+
+void writeServingCell(ByteView data, PlistDictionary* section) {
+    const PlistDictionaryRef cell = gsm::firstMatchingCell(data, {kKxCellMonitorRadioAccessTechnologyUMTS},
+                                                           kKxCellMonitorCellTypeServing);
+    if (!cell) {
+        return;
+    }
+    gsm::writeCellNumber(*cell, kKxCellMonitorCellId, section, "Cell ID",
+                         "UMTSRRInfo: Failed to retrieve Cell ID\n");
+    gsm::writeCellNumber(*cell, kKxCellMonitorUARFCN, section, "UARFCN",
+                         "UMTSRRInfo: Failed to retrieve UARFCN\n");
+    gsm::writeCellNumber(*cell, kKxCellMonitorPSC, section, "Scrambling Code",
+                         "UMTSRRInfo: Failed to retrieve Scrambling Code\n");
+}
+
+}  // namespace
+
+void UMTSRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
+    const gsm::RecordRule* rule = gsm::admitRecord("UMTSRRInfo", kRules, data, logCode);
+    if (rule == nullptr) {
+        return;
+    }
+    const PlistDictionaryRef section = sectionDictionary();
+    switch (rule->code) {
+        case kTransmitPowerCode:
+            writeTransmitPower(data, section.get());
+            break;
+        case kCellIdentityCode:
+            writeCellIdentity(data, section.get());
+            break;
+        case gsm::kCellMonitorCode:
+            writeServingCell(data, section.get());
+            break;
+        default:
+            gsm::writeRuleFields(*rule, data, section.get());
+            break;
+    }
+}
+
+std::string_view UMTSRRInfo::getSectionName() const {
+    return "UMTS RR Info";
+}
+
+LogCodeArray UMTSRRInfo::getLogCodeArray() const {
+    return gsm::codesOf(kRules);
+}
+
+}  // namespace velmar

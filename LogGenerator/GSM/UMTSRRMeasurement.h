@@ -1,0 +1,13 @@
+// UMTSRRMeasurement: the "UMTS RR Measurement" section, a placeholder that takes no codes and shows nothing.
+#pragma once
+
+#include "LogGenerator/GSM/PlaceholderDecoder.h"
+
+namespace velmar {
+
+class UMTSRRMeasurement : public PlaceholderDecoder {
+  public:
+    UMTSRRMeasurement() : PlaceholderDecoder("UMTSRRMeasurement", "UMTS RR Measurement") {}
+};
+
+}  // namespace velmar

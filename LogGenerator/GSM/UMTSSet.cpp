@@ -1,0 +1,62 @@
+#include "LogGenerator/GSM/UMTSSet.h"
+
+#include "LogGenerator/GSM/CellMonitorWalk.h"
+#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/GSM/RecordRows.h"
+#include "core/platform/KxServerProtocol.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr gsm::RecordRule kRules[] = {
+    {kLogCodeUmtsIdleMeasurements, 15},
+    {gsm::kCellMonitorCode, 0},
+};
+
+// Written in this key order, which is not the order of the fields in the entry.
+constexpr RecordField kUmtsCellFields[] = {
+    u16Field(2, "Scrambling Code"),
+    s8Field(4, "RSCP", asInt("%d dB", 1, -21)),
+    s8Field(7, "Energy Per Chip", asDouble("%f dB", 0.5)),
+    s16Field(0, "Downlink Frequency"),
+    s16Field(8, "Ranking Value"),
+    s16Field(5, "Rank Cell RSCP", asInt("%d dB")),
+};
+
+constexpr RecordRowList kUmtsCells{13, 15, 10, kUmtsCellFields};
+
+constexpr NeighbourCellField kNeighbourCellFields[] = {
+    {kKxCellMonitorUARFCN, "UARFCN", asInt(), "UMTSSet: Failed to retrieve UARFCN\n"},
+    {kKxCellMonitorPSC, "Scrambling Code", asInt(), "UMTSSet: Failed to retrieve Scrambling Code\n"},
+    {kKxCellMonitorRSCP, "RSCP", asInt("%d dBm").withSentinel(kCellMonitorNoReading, ""),
+     "UMTSSet: Failed to retrieve RSCP\n"},
+    {kKxCellMonitorEcN0, "Energy Per Chip", asInt("%d dB").withSentinel(kCellMonitorNoReading, ""),
+     "UMTSSet: Failed to retrieve Energy Per Chip\n"},
+};
+
+}  // namespace
+
+void UMTSSet::updateWithData(ByteView data, std::int32_t logCode) {
+    const gsm::RecordRule* rule = gsm::admitRecord("UMTSSet", kRules, data, logCode);
+    if (rule == nullptr) {
+        return;
+    }
+    if (rule->code == gsm::kCellMonitorCode) {
+        showNeighbourCells(data, kKxCellMonitorRadioAccessTechnologyUMTS, kNeighbourCellFields,
+                           sectionArray());
+    } else {
+        showRecordRows(kUmtsCells, RecordReader(data), sectionArray());
+    }
+}
+
+std::string_view UMTSSet::getSectionName() const {
+    return "UMTS Set";
+}
+
+LogCodeArray UMTSSet::getLogCodeArray() const {
+    return gsm::codesOf(kRules);
+}
+
+}  // namespace velmar

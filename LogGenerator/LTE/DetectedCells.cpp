@@ -1,0 +1,43 @@
+#include "LogGenerator/LTE/DetectedCells.h"
+
+#include "LogGenerator/LTE/LteRecordLayouts.h"
+#include "LogGenerator/ListSection.h"
+#include "LogGenerator/RecordFields.h"
+#include "LogGenerator/RecordPreamble.h"
+
+namespace velmar {
+
+namespace {
+
+using namespace lte_layout::intra_frequency;
+
+constexpr RecordPreamble kPreamble{"Detected Cells", kLogCode, kMinimumLength};
+
+constexpr RecordField kEntryFields[] = {
+    u16Field(0, "Physical Cell ID"),
+};
+
+}  // namespace
+
+std::string_view DetectedCells::getSectionName() const {
+    return "Detected Cells";
+}
+
+LogCodeArray DetectedCells::getLogCodeArray() const {
+    return std::vector<std::int32_t>{kLogCode};
+}
+
+void DetectedCells::updateWithData(ByteView data, std::int32_t logCode) {
+    if (!acceptRecord(kPreamble, data, logCode)) {
+        return;
+    }
+    const RecordReader record(data);
+    // The detected cells follow the N measured-neighbour entries directly.
+    const std::size_t detectedOffset =
+        kEntriesOffset + kMeasuredEntryLength * record.u8(kMeasuredCountOffset);
+    rebuildListSection(sectionArray(), record.u8(kDetectedCountOffset), [&](std::size_t index) {
+        return PlistValue(rowFromFields(kEntryFields, record, detectedOffset + kDetectedEntryLength * index));
+    });
+}
+
+}  // namespace velmar

@@ -1,0 +1,43 @@
+#include "LogGenerator/LTE/MeasuredNeighborCells.h"
+
+#include "LogGenerator/LTE/LteFormats.h"
+#include "LogGenerator/LTE/LteRecordLayouts.h"
+#include "LogGenerator/ListSection.h"
+#include "LogGenerator/RecordPreamble.h"
+
+namespace velmar {
+
+namespace {
+
+using namespace lte_layout::intra_frequency;
+
+constexpr RecordPreamble kPreamble{"Measured Neighbor Cells", kLogCode, kMinimumLength};
+
+// Offsets within a measured-neighbour entry.
+constexpr RecordField kEntryFields[] = {
+    u16Field(0, "Physical Cell ID"),
+    u16Field(2, "Filtered RSRP", lte_formats::kQuarterDbRsrp),
+    u16Field(4, "Filtered RSRQ", lte_formats::kEighthDbRsrq),
+};
+
+}  // namespace
+
+std::string_view MeasuredNeighborCells::getSectionName() const {
+    return "Measured Neighbor Cells";
+}
+
+LogCodeArray MeasuredNeighborCells::getLogCodeArray() const {
+    return std::vector<std::int32_t>{kLogCode};
+}
+
+void MeasuredNeighborCells::updateWithData(ByteView data, std::int32_t logCode) {
+    if (!acceptRecord(kPreamble, data, logCode)) {
+        return;
+    }
+    const RecordReader record(data);
+    rebuildListSection(sectionArray(), record.u8(kMeasuredCountOffset), [&](std::size_t index) {
+        return PlistValue(rowFromFields(kEntryFields, record, kEntriesOffset + kMeasuredEntryLength * index));
+    });
+}
+
+}  // namespace velmar

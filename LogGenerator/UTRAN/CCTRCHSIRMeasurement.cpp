@@ -1,0 +1,58 @@
+#include "LogGenerator/UTRAN/CCTRCHSIRMeasurement.h"
+
+#include "LogGenerator/ListSection.h"
+#include "LogGenerator/RecordFields.h"
+#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/UTRAN/UtranRecordLayouts.h"
+#include "core/platform/StringFormat.h"
+
+namespace velmar {
+
+namespace {
+
+using namespace utran_layout::channel_quality;
+
+constexpr RecordPreamble kPreamble{"CCTRCH SIR Measurement", kLogCode, kMinimumLength,
+                                   RecordPreamble::OtherCodes::Ignored};
+
+constexpr RecordField kEntryFields[] = {
+    u8Field(0, "CCTRCH ID"),
+    u8Field(1, "TSNUM"),
+};
+constexpr std::size_t kSirOffset = 2;
+constexpr std::size_t kSirCount = 6;
+
+PlistValue compositeChannelRow(const RecordReader& record, std::size_t base) {
+    PlistDictionaryRef row = rowFromFields(kEntryFields, record, base);
+    auto sir = PlistArray::create();
+    sir->reserve(kSirCount);
+    for (std::size_t index = 0; index < kSirCount; ++index) {
+        sir->append(stringWithFormat("%d", static_cast<int>(record.u8(base + kSirOffset + index))));
+    }
+    row->set("SIR", std::move(sir));
+    return row;
+}
+
+}  // namespace
+
+std::string_view CCTRCHSIRMeasurement::getSectionName() const {
+    return "CCTRCH SIR";
+}
+
+LogCodeArray CCTRCHSIRMeasurement::getLogCodeArray() const {
+    return std::vector<std::int32_t>{kLogCode};
+}
+
+void CCTRCHSIRMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
+    if (!acceptRecord(kPreamble, data, logCode)) {
+        return;
+    }
+    const RecordReader record(data);
+    const std::size_t entriesOffset =
+        kCompositeChannelEntriesOffset + kPerTransportChannelRegion * transportChannelCount(record);
+    rebuildListSection(sectionArray(), compositeChannelCount(record), [&](std::size_t index) {
+        return compositeChannelRow(record, entriesOffset + kCompositeChannelEntryLength * index);
+    });
+}
+
+}  // namespace velmar

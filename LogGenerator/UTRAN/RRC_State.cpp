@@ -1,0 +1,60 @@
+#include "LogGenerator/UTRAN/RRC_State.h"
+
+#include <string>
+
+#include "LogGenerator/RecordFields.h"
+#include "LogGenerator/RecordPreamble.h"
+#include "core/platform/Json.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr std::int32_t kLogCode = 0xD0E0;
+constexpr std::size_t kExpectedLength = 15;
+// The length is only reported, never enforced.
+constexpr RecordPreamble kPreamble{"RRC Info", kLogCode, 0, RecordPreamble::OtherCodes::Ignored};
+
+constexpr std::size_t kModeValidOffset = 13;
+constexpr std::size_t kModeOffset = 14;
+constexpr std::uint32_t kUnknownMode = 255;
+
+constexpr ValueName kStateRows[] = {
+    {0, 0, "Disconnected"}, {1, 1, "Connecting"}, {2, 2, "Cell Fach"},
+    {3, 3, "Cell DCH"},     {4, 4, "Cell PCH"},   {5, 5, "Cell URA PCH"},
+};
+constexpr ValueNames kStateNames{kStateRows, "Unknown RRC Mode"};
+
+}  // namespace
+
+std::string_view RRC_State::getSectionName() const {
+    return "RRC Info";
+}
+
+LogCodeArray RRC_State::getLogCodeArray() const {
+    return std::vector<std::int32_t>{kLogCode};
+}
+
+void RRC_State::updateWithData(ByteView data, std::int32_t logCode) {
+    if (!acceptRecord(kPreamble, data, logCode)) {
+        return;
+    }
+    if (data.size() < kExpectedLength) {
+        SystemLog::log(kLogWarning, "LogCode_0xD0E0 is length is %ld expected size %ld",
+                       static_cast<long>(data.size()), static_cast<long>(kExpectedLength));
+    }
+    const RecordReader record(data);
+    const std::uint32_t mode = record.u8(kModeValidOffset) == 1 ? record.u8(kModeOffset) : kUnknownMode;
+    const std::string state = kStateNames.nameOf(mode);
+    const PlistDictionaryRef section = sectionDictionary();
+    if (section) {
+        section->set("State", state);
+    }
+    if (SystemLog::isEnabled(kLogWarning)) {
+        const std::string description = section ? plistToJson(PlistValue(section)) : std::string("(null)");
+        SystemLog::log(kLogWarning, "Display Dict = %s, rrc mode = %d %s", description.c_str(),
+                       static_cast<int>(mode), state.c_str());
+    }
+}
+
+}  // namespace velmar

@@ -1,0 +1,43 @@
+#include "LogGenerator/UTRAN/TRCHBLERMeasurement.h"
+
+#include "LogGenerator/ListSection.h"
+#include "LogGenerator/RecordFields.h"
+#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/UTRAN/UtranRecordLayouts.h"
+
+namespace velmar {
+
+namespace {
+
+using namespace utran_layout::channel_quality;
+
+constexpr RecordPreamble kPreamble{"TRCH BLER Measurement", kLogCode, kMinimumLength,
+                                   RecordPreamble::OtherCodes::Ignored, kLogNotice};
+
+constexpr RecordField kEntryFields[] = {
+    u8Field(0, "TRCH ID"),
+    u8Field(1, "TRCH BLER Measurement"),
+};
+
+}  // namespace
+
+std::string_view TRCHBLERMeasurement::getSectionName() const {
+    return "TRCH BLER";
+}
+
+LogCodeArray TRCHBLERMeasurement::getLogCodeArray() const {
+    return std::vector<std::int32_t>{kLogCode};
+}
+
+void TRCHBLERMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
+    if (!acceptRecord(kPreamble, data, logCode)) {
+        return;
+    }
+    const RecordReader record(data);
+    rebuildListSection(sectionArray(), transportChannelCount(record), [&](std::size_t index) {
+        return PlistValue(rowFromFields(
+            kEntryFields, record, kTransportChannelEntriesOffset + kTransportChannelEntryLength * index));
+    });
+}
+
+}  // namespace velmar

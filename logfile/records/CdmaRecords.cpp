@@ -1,0 +1,197 @@
+#include "logfile/records/CdmaRecords.h"
+
+#include "logfile/records/RecordBuilder.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr std::size_t kSubpacketHeaderLength = 4;
+constexpr std::size_t kFirstSubpacketOffset = 17;
+
+PlistData subpacketBytes(const CdmaSubpacket& subpacket) {
+    PlistData bytes(kSubpacketHeaderLength, 0);
+    const std::uint16_t size = subpacket.declaredSize.value_or(
+        static_cast<std::uint16_t>(kSubpacketHeaderLength + subpacket.body.size()));
+    bytes[0] = subpacket.identifier;
+    bytes[1] = subpacket.version;
+    bytes[2] = static_cast<std::uint8_t>(size & 0xFF);
+    bytes[3] = static_cast<std::uint8_t>(size >> 8);
+    bytes.insert(bytes.end(), subpacket.body.begin(), subpacket.body.end());
+    return bytes;
+}
+
+void putLE(PlistData& bytes, std::size_t offset, std::size_t width, std::uint64_t value) {
+    if (bytes.size() < offset + width) {
+        bytes.resize(offset + width, 0);
+    }
+    for (std::size_t i = 0; i < width; ++i) {
+        bytes[offset + i] = static_cast<std::uint8_t>(value >> (8 * i));
+    }
+}
+
+PlistData buildSubpacketRecord(std::uint16_t code, const CdmaSubpacketRecord& record,
+                               std::uint64_t timestamp) {
+    RecordBuilder builder(code, timestamp);
+    builder.u8(13, record.version)
+        .u8(14, record.declaredCount.value_or(static_cast<std::uint8_t>(record.subpackets.size())))
+        .u16(15, 0);
+    std::size_t offset = kFirstSubpacketOffset;
+    for (const CdmaSubpacket& subpacket : record.subpackets) {
+        const PlistData bytes = subpacketBytes(subpacket);
+        builder.bytes(offset, bytes);
+        offset += bytes.size();
+    }
+    return builder.resize(offset + record.trailingBytes).build();
+}
+
+}  // namespace
+
+PlistData buildEvdoStatusRecord(const EvdoStatusRecord& record, std::uint64_t timestamp) {
+    return RecordBuilder(kCdmaEvdoStatusCode, timestamp)
+        .u16(13, record.channel & 0x7FF)
+        .bits(14, 1, 3, 7, record.bandClass)
+        .s8(15, record.rxAgc0)
+        .s8(16, record.rxAgc1)
+        .s8(17, record.txAgc)
+        .u16(18, record.pnOffset)
+        .u8(36, record.deviceState)
+        .u8(37, record.sessionState)
+        .u24(38, record.uati24 & 0xFFFFFF)
+        .u8(41, record.colorCode)
+        .resize(record.length)
+        .build();
+}
+
+PlistData buildEvdoActiveSetRecord(const EvdoActiveSetRecord& record, std::uint64_t timestamp) {
+    RecordBuilder builder(kCdmaEvdoActiveSetCode, timestamp);
+    builder.u8(15, record.declaredCount.value_or(static_cast<std::uint8_t>(record.pilots.size())));
+    constexpr std::size_t kFirstPilot = 25;
+    constexpr std::size_t kPilotSize = 12;
+    for (std::size_t i = 0; i < record.pilots.size(); ++i) {
+        const std::size_t entry = kFirstPilot + kPilotSize * i;
+        builder.u16(entry, record.pilots[i].pn).u16(entry + 2, record.pilots[i].strength);
+    }
+    return builder.resize(record.length.value_or(kFirstPilot + kPilotSize * record.pilots.size())).build();
+}
+
+PlistData buildFingerC2IRecord(const FingerC2IRecord& record, std::uint64_t timestamp) {
+    RecordBuilder builder(kCdmaFingerC2ICode, timestamp);
+    builder.u8(22, record.declaredCount.value_or(static_cast<std::uint8_t>(record.fingers.size())));
+    constexpr std::size_t kFirstFinger = 23;
+    constexpr std::size_t kFingerSize = 14;
+    for (std::size_t i = 0; i < record.fingers.size(); ++i) {
+        const std::size_t entry = kFirstFinger + kFingerSize * i;
+        builder.u16(entry, record.fingers[i].pilot).u16(entry + 6, record.fingers[i].c2i);
+    }
+    return builder.resize(record.length.value_or(kFirstFinger + kFingerSize * record.fingers.size())).build();
+}
+
+CdmaSubpacket cdma1xStateSubpacket(std::uint8_t deviceState) {
+    CdmaSubpacket subpacket;
+    subpacket.identifier = 1;
+    subpacket.body = {deviceState, 0, 0, 0};
+    return subpacket;
+}
+
+CdmaSubpacket cdma1xRadioSubpacket(const Cdma1xRadio& radio) {
+    CdmaSubpacket subpacket;
+    subpacket.identifier = 2;
+    PlistData whole(kSubpacketHeaderLength, 0);
+    putLE(whole, 4, 1, radio.rx0BandClass);
+    putLE(whole, 5, 1, radio.rx1BandClass);
+    putLE(whole, 6, 2, radio.rx0Channel);
+    putLE(whole, 8, 2, radio.rx1Channel);
+    putLE(whole, 10, 1, static_cast<std::uint8_t>(radio.rxAgc0));
+    putLE(whole, 11, 1, static_cast<std::uint8_t>(radio.rxAgc1));
+    putLE(whole, 12, 2, static_cast<std::uint16_t>(radio.txPower));
+    putLE(whole, 14, 2, 0);
+    subpacket.body.assign(whole.begin() + kSubpacketHeaderLength, whole.end());
+    return subpacket;
+}
+
+CdmaSubpacket cdma1xActiveSetSubpacket(const Cdma1xActiveSet& activeSet) {
+    CdmaSubpacket subpacket;
+    subpacket.identifier = 3;
+    PlistData whole(12, 0);
+    putLE(whole, 4, 2, activeSet.l);
+    putLE(whole, 6, 1, activeSet.m);
+    putLE(whole, 7, 1, activeSet.q);
+    putLE(whole, 8, 1, activeSet.declaredCount.value_or(static_cast<std::uint8_t>(activeSet.pilots.size())));
+    putLE(whole, 9, 1, activeSet.f);
+    putLE(whole, 10, 2, activeSet.referencePn);
+    const std::size_t entrySize = (6 * std::size_t{activeSet.f} + 15) & ~std::size_t{3};
+    for (std::size_t i = 0; i < activeSet.pilots.size(); ++i) {
+        const std::size_t entry = entrySize * i;
+        putLE(whole, entry + 12, 2, activeSet.pilots[i].pn);
+        putLE(whole, entry + 24 + 4 * std::size_t{activeSet.f}, 2, activeSet.pilots[i].energy);
+    }
+    subpacket.body.assign(whole.begin() + kSubpacketHeaderLength, whole.end());
+    return subpacket;
+}
+
+CdmaSubpacket cdma1xFingerSubpacket() {
+    CdmaSubpacket subpacket;
+    subpacket.identifier = 4;
+    subpacket.body.assign(8, 0);
+    return subpacket;
+}
+
+CdmaSubpacket cdma1xTrafficDemodSubpacket(bool erasure) {
+    CdmaSubpacket subpacket;
+    subpacket.identifier = 11;
+    PlistData whole(28, 0);
+    whole[24] = erasure ? 1 : 0;
+    subpacket.body.assign(whole.begin() + kSubpacketHeaderLength, whole.end());
+    return subpacket;
+}
+
+PlistData build1xStatusRecord(const CdmaSubpacketRecord& record, std::uint64_t timestamp) {
+    return buildSubpacketRecord(kCdma1xStatusCode, record, timestamp);
+}
+
+PlistData build1xTrafficRecord(const CdmaSubpacketRecord& record, std::uint64_t timestamp) {
+    return buildSubpacketRecord(kCdma1xTrafficCode, record, timestamp);
+}
+
+PlistData build1xSystemIdentityRecord(const Cdma1xSystemIdentityRecord& record, std::uint64_t timestamp) {
+    return RecordBuilder(kCdma1xSystemIdentityCode, timestamp)
+        .u8(13, record.version)
+        .u32(42, record.roamingIndicator)
+        .u32(46, record.systemType)
+        .u16(50, record.systemId)
+        .u16(52, record.networkId)
+        .u8(131, record.packetZoneId)
+        .u8(133, record.protocolRevision)
+        .u16(184, record.baseId)
+        .resize(record.length)
+        .build();
+}
+
+PlistData buildEvdoForwardLinkRecord(const EvdoForwardLinkRecord& record, std::uint64_t timestamp) {
+    RecordBuilder builder(kCdmaForwardLinkCode, timestamp);
+    builder.u32(13, record.sequence);
+    for (std::size_t i = 0; i < record.counters.size(); ++i) {
+        builder.u32(17 + 4 * i, record.counters[i]);
+    }
+    return builder.resize(record.length).build();
+}
+
+PlistData buildEvdoReverseLinkRecord(const EvdoReverseLinkRecord& record, std::uint64_t timestamp) {
+    RecordBuilder builder(kCdmaReverseLinkCode, timestamp);
+    builder.u32(14, record.sequence);
+    constexpr std::size_t kBlocks = 22;
+    constexpr std::size_t kBlockSize = 576;
+    constexpr std::size_t kClassSize = 48;
+    for (std::size_t block = 0; block < record.counters.size(); ++block) {
+        for (std::size_t rateClass = 0; rateClass < record.counters[block].size(); ++rateClass) {
+            for (std::size_t slot = 0; slot < record.counters[block][rateClass].size(); ++slot) {
+                builder.u32(kBlocks + kBlockSize * block + kClassSize * rateClass + 4 * slot,
+                            record.counters[block][rateClass][slot]);
+            }
+        }
+    }
+    return builder.resize(record.length).build();
+}
+
+}  // namespace velmar

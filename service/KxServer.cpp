@@ -1,0 +1,171 @@
+#include "service/KxServer.h"
+
+#include <unistd.h>
+
+#include <algorithm>
+#include <chrono>
+
+#include "core/platform/KxServerProtocol.h"
+#include "core/platform/SystemLog.h"
+#include "core/platform/plist/PlistCodec.h"
+#include "service/KxReplies.h"
+
+namespace velmar {
+
+namespace {
+
+// A port name is a socket file's name in the runtime directory: no path, nothing hidden in it.
+bool isPortName(const std::string& name) {
+    constexpr std::size_t kMaxPortName = 96;
+    return !name.empty() && name.size() <= kMaxPortName && name != "." && name != ".." &&
+           std::none_of(name.begin(), name.end(), [](char c) { return c == '/' || c == '\0'; });
+}
+
+}  // namespace
+
+KxServer::KxServer(MainQueue& queue, std::string_view technology, bool objectBased)
+    : queue_(queue),
+      technology_(technology),
+      objectBased_(objectBased),
+      alive_(std::make_shared<bool>(true)) {}
+
+KxServer::~KxServer() {
+    shutdown();
+}
+
+KxServer::OpenResult KxServer::open() {
+    bool exists = false;
+    controlPort_ = MessagePort::createLocal(
+        std::string(kKxServerControlPortName),
+        [this](std::int32_t, ByteView data) { return onControlMessage(data); }, &exists,
+        MessagePort::LocalMode::Serving);
+    if (exists) {
+        controlPort_.reset();
+        return OpenResult::AlreadyRunning;
+    }
+    if (!controlPort_) {
+        return OpenResult::Failed;
+    }
+    controlPort_->setDispatchQueue(queue_);
+    return OpenResult::Serving;
+}
+
+void KxServer::shutdown() {
+    *alive_ = false;
+    ready_ = nullptr;
+    // The list is emptied first, so that nothing walks it while the channels end.
+    const std::vector<std::shared_ptr<LogChannel>> channels = std::move(channels_);
+    channels_.clear();
+    for (const std::shared_ptr<LogChannel>& channel : channels) {
+        channel->end("service stopping");
+    }
+    if (controlPort_) {
+        controlPort_->setInvalidationCallback(nullptr);
+        controlPort_->invalidate();
+        controlPort_.reset();
+    }
+}
+
+PlistData KxServer::reject(std::int32_t error, const std::string& reason) {
+    SystemLog::log(kLogError, "control request rejected: %s", reason.c_str());
+    return kxErrorReply(error, reason);
+}
+
+std::optional<PlistData> KxServer::onControlMessage(ByteView data) {
+    const std::optional<PlistValue> message = parsePropertyList(data);
+    const PlistDictionaryRef request = message ? message->dictionary() : nullptr;
+    if (!request) {
+        return reject(kKxErrorBadRequest, "request is not a property-list dictionary");
+    }
+    const std::string* name = request->get(kKxRequestKey).string();
+    if (name == nullptr) {
+        return reject(kKxErrorBadRequest, "request has no Request string");
+    }
+    if (*name != kKxRequestCreateLogChannel) {
+        return reject(kKxErrorBadRequest, "unknown request " + quotedForLog(*name));
+    }
+    const std::string* receivePort = request->get(kKxReceivePortKey).string();
+    if (receivePort == nullptr) {
+        return reject(kKxErrorBadRequest, "CreateLogChannel has no ReceivePort string");
+    }
+    if (!isPortName(*receivePort)) {
+        return reject(kKxErrorBadRequest,
+                      "ReceivePort " + quotedForLog(*receivePort) + " is not a port name");
+    }
+
+    LogChannel::Settings settings;
+    settings.id = nextChannelId_++;
+    settings.channelPortName = std::string(kKxServerControlPortName) + ".channel." +
+                               std::to_string(getpid()) + "." + std::to_string(settings.id);
+    settings.receivePortName = *receivePort;
+    settings.technology = technology_;
+    settings.objectBased = objectBased_;
+    std::int32_t error = 0;
+    std::string reason;
+    std::shared_ptr<LogChannel> channel = LogChannel::open(settings, queue_, *this, error, reason);
+    if (!channel) {
+        SystemLog::log(kLogError, "channel %u not created: %s", settings.id, reason.c_str());
+        return kxErrorReply(error, reason);
+    }
+    SystemLog::log(kLogNotice, "channel %u: created for receive port %s, listening on %s", settings.id,
+                   quotedForLog(*receivePort).c_str(), settings.channelPortName.c_str());
+    channels_.push_back(std::move(channel));
+    return kxChannelCreatedReply(settings.channelPortName);
+}
+
+void KxServer::deliver(const BasebandBlob& blob) {
+    // A channel that ends meanwhile stays in the list (not streaming) until the queued pruning.
+    for (const std::shared_ptr<LogChannel>& channel : channels_) {
+        channel->offer(blob);
+    }
+}
+
+bool KxServer::canTakeMore() const {
+    const auto now = std::chrono::steady_clock::now();
+    bool someKeepsUp = false;
+    for (const std::shared_ptr<LogChannel>& channel : channels_) {
+        if (channel->keepsUp()) {
+            someKeepsUp = true;
+        } else if (channel->streaming() && !channel->stalled(now)) {
+            return false;  // behind, but its client reads: wait for it
+        }
+    }
+    return someKeepsUp;
+}
+
+void KxServer::notifyWhenReady(std::function<void()> ready) {
+    ready_ = std::move(ready);
+}
+
+void KxServer::channelReady(LogChannel& /*channel*/) {
+    wakeSource();
+}
+
+void KxServer::wakeSource() {
+    if (!ready_) {
+        return;
+    }
+    queue_.async(std::move(ready_));
+    ready_ = nullptr;
+}
+
+void KxServer::channelEnded(LogChannel& /*channel*/) {
+    if (pruneQueued_) {
+        return;
+    }
+    pruneQueued_ = true;
+    queue_.async([this, alive = std::weak_ptr<bool>(alive_)] {
+        const std::shared_ptr<bool> live = alive.lock();
+        if (!live || !*live) {
+            return;
+        }
+        pruneQueued_ = false;
+        std::erase_if(channels_, [](const std::shared_ptr<LogChannel>& channel) { return channel->ended(); });
+        // The channels left may keep up where the one that went did not.
+        if (canTakeMore()) {
+            wakeSource();
+        }
+    });
+}
+
+}  // namespace velmar

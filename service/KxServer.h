@@ -1,0 +1,69 @@
+// KxServer: the service's control port and its log channels; the sink into which the baseband source
+// delivers.
+//
+// Contract:
+// - open() listens on the control port com.velmar.kxserver (a serving port: clients come and go). A live
+//   listener there means another service is running: AlreadyRunning, and this one must not serve.
+// - {"Request": "CreateLogChannel", "ReceivePort": name} creates a channel (LogChannel) streaming to that
+//   port, listening on "com.velmar.kxserver.channel.<pid>.<n>", and answers {"Domain": 1, "Error": 0,
+//   "ChannelPort": name}. Anything else is answered with a non-zero Error and a Reason, and logged.
+// - deliver() offers each blob to every channel. canTakeMore() holds when some streaming channel keeps up
+//   and none is behind with a client still reading: a source that is not paced by time goes at the pace of
+//   the slowest live client, while a stalled client only loses its own oldest blobs.
+// - shutdown() ends every channel and closes the control port; the socket files go with them.
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "core/platform/MainQueue.h"
+#include "core/platform/MessagePort.h"
+#include "service/BasebandSource.h"
+#include "service/LogChannel.h"
+
+namespace velmar {
+
+class KxServer : public BlobSink, private LogChannel::Listener {
+  public:
+    enum class OpenResult { Serving, AlreadyRunning, Failed };
+
+    // technology is the answer to "GetTechnology"; objectBased streams every blob to every channel.
+    KxServer(MainQueue& queue, std::string_view technology, bool objectBased);
+    ~KxServer() override;
+    KxServer(const KxServer&) = delete;
+    KxServer& operator=(const KxServer&) = delete;
+
+    OpenResult open();
+    void shutdown();
+
+    void deliver(const BasebandBlob& blob) override;
+    bool canTakeMore() const override;
+    void notifyWhenReady(std::function<void()> ready) override;
+
+    std::size_t channelCount() const { return channels_.size(); }
+
+  private:
+    std::optional<PlistData> onControlMessage(ByteView data);
+    PlistData reject(std::int32_t error, const std::string& reason);
+    void channelReady(LogChannel& channel) override;
+    void channelEnded(LogChannel& channel) override;
+    // Resumes a source that waits for the channels to take more.
+    void wakeSource();
+
+    MainQueue& queue_;
+    std::string_view technology_;
+    bool objectBased_;
+    std::shared_ptr<MessagePort> controlPort_;
+    std::vector<std::shared_ptr<LogChannel>> channels_;
+    unsigned nextChannelId_ = 1;
+    std::function<void()> ready_;
+    bool pruneQueued_ = false;
+    std::shared_ptr<bool> alive_;
+};
+
+}  // namespace velmar

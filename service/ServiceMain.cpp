@@ -1,0 +1,117 @@
+#include "service/ServiceMain.h"
+
+#include <sys/signalfd.h>
+#include <unistd.h>
+
+#include <csignal>
+#include <cstdio>
+#include <string>
+#include <vector>
+
+#include "core/platform/KxServerProtocol.h"
+#include "core/platform/PollMainQueue.h"
+#include "core/platform/SystemLog.h"
+#include "service/KxServer.h"
+#include "service/ServiceOptions.h"
+#include "service/SourceFactory.h"
+
+namespace velmar {
+
+namespace {
+
+constexpr const char* kProgramName = "kxserverd";
+constexpr int kExitCannotStart = 1;
+constexpr int kExitUsage = 2;
+
+int cannotStart(const std::string& message) {
+    std::fprintf(stderr, "%s: %s\n", kProgramName, message.c_str());
+    SystemLog::log(kLogError, "%s", message.c_str());
+    return kExitCannotStart;
+}
+
+// SIGTERM and SIGINT arrive as readable data on a descriptor that the main queue watches, so that the
+// shutdown runs as an ordinary queue callback. Answers -1 when that cannot be arranged.
+int openTerminationSignals() {
+    sigset_t signals;
+    sigemptyset(&signals);
+    sigaddset(&signals, SIGTERM);
+    sigaddset(&signals, SIGINT);
+    if (sigprocmask(SIG_BLOCK, &signals, nullptr) != 0) {
+        return -1;
+    }
+    return signalfd(-1, &signals, SFD_NONBLOCK | SFD_CLOEXEC);
+}
+
+}  // namespace
+
+int runKxServerd(int argc, char** argv) {
+    const ParsedServiceOptions parsed = parseServiceOptions(std::vector<std::string>(argv + 1, argv + argc));
+    if (parsed.help) {
+        std::fputs(std::string(serviceUsage()).c_str(), stdout);
+        return 0;
+    }
+    if (!parsed.error.empty()) {
+        std::fprintf(stderr, "%s: %s (see --help)\n", kProgramName, parsed.error.c_str());
+        return kExitUsage;
+    }
+    const ServiceOptions& options = parsed.options;
+    SystemLog::configureFromEnvironment(kProgramName);
+    SystemLog::setMirrorToStderr(options.logStderr);
+    std::signal(SIGPIPE, SIG_IGN);
+
+    std::string error;
+    const std::unique_ptr<BasebandSource> source = makeBasebandSource(options, error);
+    if (!source) {
+        std::fprintf(stderr, "%s: %s\n", kProgramName, error.c_str());
+        return kExitUsage;
+    }
+    const int signals = openTerminationSignals();
+    if (signals < 0) {
+        return cannotStart("cannot watch for SIGTERM and SIGINT");
+    }
+    PollMainQueue queue;
+    MainQueue::setCurrent(&queue);
+    KxServer server(queue, options.technology, options.objectBased);
+    switch (server.open()) {
+        case KxServer::OpenResult::Serving:
+            break;
+        case KxServer::OpenResult::AlreadyRunning:
+            close(signals);
+            return cannotStart("another kxserverd is already running on port " +
+                               std::string(kKxServerControlPortName));
+        case KxServer::OpenResult::Failed:
+            close(signals);
+            return cannotStart("cannot listen on port " + std::string(kKxServerControlPortName));
+    }
+    if (!source->prepare(error)) {
+        server.shutdown();
+        close(signals);
+        return cannotStart(error);
+    }
+
+    int stoppedBy = 0;
+    const MainQueue::Handle signalWatch = queue.watchReadable(signals, [&] {
+        signalfd_siginfo info{};
+        while (read(signals, &info, sizeof info) == static_cast<ssize_t>(sizeof info)) {
+            stoppedBy = static_cast<int>(info.ssi_signo);
+        }
+        if (stoppedBy != 0) {
+            queue.stop();
+        }
+    });
+    SystemLog::log(kLogNotice, "kxserverd: serving %s on port %s; source: %s",
+                   std::string(options.technology).c_str(), std::string(kKxServerControlPortName).c_str(),
+                   source->description().c_str());
+    source->start(queue, server);
+    queue.run();
+
+    SystemLog::log(kLogNotice, "kxserverd: stopping on signal %d", stoppedBy);
+    source->stop();
+    server.shutdown();
+    queue.unwatch(signalWatch);
+    close(signals);
+    MainQueue::setCurrent(nullptr);
+    return 0;
+}
+
+}  // namespace velmar

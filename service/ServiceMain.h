@@ -1,0 +1,14 @@
+// runKxServerd: the whole life of the kxserverd process, from its command line to its exit status.
+//
+// Contract: --help prints the usage on standard output (status 0); a usage error or a source this build
+// does not have prints one line on standard error (status 2); a service that cannot start (control port
+// held by another kxserverd, unreadable input, device that cannot be opened) prints one line and answers 1.
+// Otherwise it serves on the poll main queue until SIGTERM or SIGINT, then ends every channel, removes its
+// socket files and answers 0.
+#pragma once
+
+namespace velmar {
+
+int runKxServerd(int argc, char** argv);
+
+}  // namespace velmar

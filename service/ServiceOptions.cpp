@@ -1,0 +1,264 @@
+#include "service/ServiceOptions.h"
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <cmath>
+#include <cstdlib>
+
+#include "core/platform/KxServerProtocol.h"
+
+namespace velmar {
+
+namespace {
+
+struct TechnologyName {
+    std::string_view name;
+    std::string_view constant;
+    bool objectBased;
+};
+
+constexpr std::array<TechnologyName, 5> kTechnologies = {{
+    {"gsm", kKxLogChannelTechnology_Orvane_GSM, false},
+    {"lte", kKxLogChannelTechnology_Orvane_LTE, false},
+    {"utran", kKxLogChannelTechnology_Orvane_UTRAN2, false},
+    {"cdma", kKxLogChannelTechnology_Orvane_CDMA, false},
+    {"ifx", kKxLogChannelTechnology_IFX, true},
+}};
+
+struct SourceName {
+    std::string_view name;
+    SourceKind kind;
+};
+
+constexpr std::array<SourceName, 3> kSources = {{
+    {"sim", SourceKind::Sim},
+    {"replay", SourceKind::Replay},
+    {"live", SourceKind::Live},
+}};
+
+// Which sources each source-specific option applies to.
+struct OptionScope {
+    std::string_view option;
+    bool sim;
+    bool replay;
+    bool live;
+};
+
+constexpr std::array<OptionScope, 6> kScopes = {{
+    {"--input", false, true, false},
+    {"--device", false, false, true},
+    {"--speed", true, true, false},
+    {"--fast", true, true, false},
+    {"--loop", false, true, false},
+    {"--seed", true, false, false},
+}};
+
+constexpr std::string_view kUsage =
+    R"(Usage: kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]
+                 [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
+
+The telephony service: owns one baseband source and serves log channels to monitor clients on the
+control port com.velmar.kxserver (a socket in $VELMAR_RUNTIME_DIR, else $XDG_RUNTIME_DIR/velmar, else
+/tmp/velmar-<uid>). Each client's start command names the log codes and extra codes it receives.
+
+  --source sim|replay|live  where the blobs come from (default: sim, the simulated baseband, which this
+                            build does not have yet: use replay or live)
+  --technology NAME         the technology answered to GetTechnology: gsm, lte (default), utran, cdma,
+                            or ifx (the object-based technology: every blob goes to every channel)
+  --input FILE              replay: the recorded log (hex blob file, DLF, raw diagnostic-port capture or
+                            snapshot; told apart by extension, else by content)
+  --speed X                 replay: X times the recorded pace (default 1); blobs without timestamps go
+                            at 50 per second
+  --fast                    replay: as fast as the streaming channels take the blobs
+  --loop                    replay: start again at the end (otherwise the service stays up, idle)
+  --seed N                  sim: seed of the simulated baseband
+  --device PATH             live: the diagnostic port (character device or FIFO), read as a raw capture
+  --log-stderr              also write system-log lines to standard error as "<priority> text";
+                            VELMAR_LOG_LEVEL (error, warning, notice, info, debug) sets the threshold
+  --help                    show this help and exit
+
+SIGTERM or SIGINT closes every channel and the control port and exits with status 0. Exit status 1:
+the service could not start (another kxserverd is already running, unreadable input, device that cannot
+be opened); 2: usage error.
+)";
+
+bool appliesTo(const OptionScope& scope, SourceKind source) {
+    switch (source) {
+        case SourceKind::Sim:
+            return scope.sim;
+        case SourceKind::Replay:
+            return scope.replay;
+        case SourceKind::Live:
+            return scope.live;
+    }
+    return false;
+}
+
+std::string_view sourceName(SourceKind kind) {
+    for (const SourceName& source : kSources) {
+        if (source.kind == kind) {
+            return source.name;
+        }
+    }
+    return "";
+}
+
+std::string quoted(std::string_view text) {
+    return "\"" + std::string(text) + "\"";
+}
+
+std::optional<double> parseSpeed(const std::string& text) {
+    if (text.empty()) {
+        return std::nullopt;
+    }
+    errno = 0;
+    char* end = nullptr;
+    const double value = std::strtod(text.c_str(), &end);
+    if (errno != 0 || end != text.c_str() + text.size() || !std::isfinite(value) || value <= 0) {
+        return std::nullopt;
+    }
+    return value;
+}
+
+std::optional<std::uint64_t> parseSeed(const std::string& text) {
+    if (text.empty() || text.find_first_not_of("0123456789") != std::string::npos) {
+        return std::nullopt;
+    }
+    errno = 0;
+    char* end = nullptr;
+    const unsigned long long value = std::strtoull(text.c_str(), &end, 10);
+    if (errno != 0 || end != text.c_str() + text.size()) {
+        return std::nullopt;
+    }
+    return static_cast<std::uint64_t>(value);
+}
+
+}  // namespace
+
+std::string_view serviceUsage() {
+    return kUsage;
+}
+
+ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& arguments) {
+    ParsedServiceOptions parsed;
+    ServiceOptions& options = parsed.options;
+    std::vector<std::string_view> given;  // source-specific options as given, in order
+    const auto fail = [&parsed](std::string message) {
+        parsed.error = std::move(message);
+        return parsed;
+    };
+
+    for (const std::string& argument : arguments) {
+        if (argument == "--help" || argument == "-h") {
+            parsed.help = true;
+            return parsed;
+        }
+    }
+    for (std::size_t index = 0; index < arguments.size(); ++index) {
+        const std::string& argument = arguments[index];
+        if (argument.rfind("--", 0) != 0 || argument.size() == 2) {
+            return fail("unexpected argument " + quoted(argument));
+        }
+        std::string name = argument;
+        std::optional<std::string> inlineValue;
+        if (const std::size_t equals = argument.find('='); equals != std::string::npos) {
+            name = argument.substr(0, equals);
+            inlineValue = argument.substr(equals + 1);
+        }
+        const bool isFlag = name == "--fast" || name == "--loop" || name == "--log-stderr";
+        std::string value;
+        if (isFlag) {
+            if (inlineValue) {
+                return fail(name + " takes no value");
+            }
+        } else if (name == "--source" || name == "--technology" || name == "--input" || name == "--speed" ||
+                   name == "--seed" || name == "--device") {
+            if (inlineValue) {
+                value = *inlineValue;
+            } else if (index + 1 < arguments.size()) {
+                value = arguments[++index];
+            } else {
+                return fail(name + " needs a value");
+            }
+            if (value.empty()) {
+                return fail(name + " needs a value");
+            }
+        } else {
+            return fail("unknown option " + name);
+        }
+        for (const OptionScope& scope : kScopes) {
+            if (scope.option == name) {
+                given.push_back(scope.option);
+            }
+        }
+
+        if (name == "--source") {
+            const auto found =
+                std::find_if(kSources.begin(), kSources.end(),
+                             [&value](const SourceName& source) { return source.name == value; });
+            if (found == kSources.end()) {
+                return fail("unknown source " + quoted(value) + " (sim, replay or live)");
+            }
+            options.source = found->kind;
+        } else if (name == "--technology") {
+            const auto found =
+                std::find_if(kTechnologies.begin(), kTechnologies.end(),
+                             [&value](const TechnologyName& technology) { return technology.name == value; });
+            if (found == kTechnologies.end()) {
+                return fail("unknown technology " + quoted(value) + " (gsm, lte, utran, cdma or ifx)");
+            }
+            options.technologyName = found->name;
+        } else if (name == "--input") {
+            options.input = value;
+        } else if (name == "--device") {
+            options.device = value;
+        } else if (name == "--speed") {
+            const std::optional<double> speed = parseSpeed(value);
+            if (!speed) {
+                return fail("--speed needs a positive number, not " + quoted(value));
+            }
+            options.speed = *speed;
+        } else if (name == "--seed") {
+            const std::optional<std::uint64_t> seed = parseSeed(value);
+            if (!seed) {
+                return fail("--seed needs a non-negative integer, not " + quoted(value));
+            }
+            options.seed = seed;
+        } else if (name == "--fast") {
+            options.fast = true;
+        } else if (name == "--loop") {
+            options.loop = true;
+        } else if (name == "--log-stderr") {
+            options.logStderr = true;
+        }
+    }
+
+    for (const TechnologyName& technology : kTechnologies) {
+        if (technology.name == options.technologyName) {
+            options.technology = technology.constant;
+            options.objectBased = technology.objectBased;
+        }
+    }
+    const bool speedGiven = std::find(given.begin(), given.end(), "--speed") != given.end();
+    if (speedGiven && options.fast) {
+        return fail("--speed and --fast exclude each other");
+    }
+    for (const std::string_view option : given) {
+        for (const OptionScope& scope : kScopes) {
+            if (scope.option == option && !appliesTo(scope, options.source)) {
+                return fail(std::string(option) + " does not apply to --source " +
+                            std::string(sourceName(options.source)));
+            }
+        }
+    }
+    if (options.source == SourceKind::Replay && options.input.empty()) {
+        return fail("--source replay needs --input FILE");
+    }
+    if (options.source == SourceKind::Live && options.device.empty()) {
+        return fail("--source live needs --device PATH");
+    }
+    return parsed;
+}
+
+}  // namespace velmar

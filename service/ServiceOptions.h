@@ -1,0 +1,45 @@
+// ServiceOptions: kxserverd's command line.
+//
+//   kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]
+//             [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
+//
+// Contract: parseServiceOptions reads the arguments after the program name ("--name value" or
+// "--name=value"). It answers the options, or help (--help anywhere), or a one-line usage error: an unknown
+// option or value, a missing value, a bad number, --speed with --fast, a source without its input, or an
+// option that does not apply to the chosen source.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace velmar {
+
+enum class SourceKind { Sim, Replay, Live };
+
+struct ServiceOptions {
+    SourceKind source = SourceKind::Sim;
+    std::string_view technologyName = "lte";
+    std::string_view technology;  // the "GetTechnology" answer
+    bool objectBased = false;     // the technology's start command names no codes
+    std::string input;
+    std::string device;
+    double speed = 1.0;
+    bool fast = false;
+    bool loop = false;
+    std::optional<std::uint64_t> seed;
+    bool logStderr = false;
+};
+
+struct ParsedServiceOptions {
+    ServiceOptions options;
+    bool help = false;
+    std::string error;  // a usage error when not empty
+};
+
+ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& arguments);
+std::string_view serviceUsage();
+
+}  // namespace velmar

@@ -1,0 +1,188 @@
+// kxserverd's command line, as a process: help, usage errors, the source this build does not have yet, a
+// second instance and sources that cannot start.
+#include <gtest/gtest.h>
+
+#include <dirent.h>
+
+#include <string>
+#include <vector>
+
+#include "service/ServiceOptions.h"
+#include "tests/service/ServiceTestFixture.h"
+#include "tests/support/Process.h"
+
+namespace velmar::testing {
+namespace {
+
+ProcessResult runService(std::vector<std::string> arguments) {
+    arguments.insert(arguments.begin(), KXSERVERD_PATH);
+    return runProcess(arguments);
+}
+
+std::vector<std::string> filesIn(const std::string& directory) {
+    std::vector<std::string> names;
+    if (DIR* dir = opendir(directory.c_str())) {
+        while (const dirent* entry = readdir(dir)) {
+            const std::string name = entry->d_name;
+            if (name != "." && name != "..") {
+                names.push_back(name);
+            }
+        }
+        closedir(dir);
+    }
+    return names;
+}
+
+using ServiceArgumentsTest = ServiceTest;
+
+TEST_F(ServiceArgumentsTest, HelpPrintsTheUsageAndExitsZero) {
+    const ProcessResult result = runService({"--help"});
+    EXPECT_EQ(result.exitCode, 0);
+    EXPECT_EQ(result.err, "");
+    const std::vector<std::string> lines = linesOf(result.out);
+    ASSERT_GE(lines.size(), 2U);
+    EXPECT_EQ(
+        lines[0],
+        "Usage: kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]");
+    EXPECT_EQ(lines[1],
+              "                 [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]");
+    // Help wins over anything else on the line, even arguments that are errors.
+    EXPECT_EQ(runService({"--bogus", "--help"}).exitCode, 0);
+}
+
+TEST_F(ServiceArgumentsTest, UsageErrorsPrintOneLineAndExitTwo) {
+    const struct {
+        std::vector<std::string> arguments;
+        std::string message;
+    } cases[] = {
+        {{"--bogus"}, "kxserverd: unknown option --bogus (see --help)\n"},
+        {{"trace.hex"}, "kxserverd: unexpected argument \"trace.hex\" (see --help)\n"},
+        {{"--technology"}, "kxserverd: --technology needs a value (see --help)\n"},
+        {{"--technology", "wimax"},
+         "kxserverd: unknown technology \"wimax\" (gsm, lte, utran, cdma or ifx) (see --help)\n"},
+        {{"--source", "tape"}, "kxserverd: unknown source \"tape\" (sim, replay or live) (see --help)\n"},
+        {{"--source", "replay"}, "kxserverd: --source replay needs --input FILE (see --help)\n"},
+        {{"--source", "live"}, "kxserverd: --source live needs --device PATH (see --help)\n"},
+        {{"--source", "replay", "--input", "x.hex", "--speed", "2", "--fast"},
+         "kxserverd: --speed and --fast exclude each other (see --help)\n"},
+        {{"--source", "replay", "--input", "x.hex", "--speed", "0"},
+         "kxserverd: --speed needs a positive number, not \"0\" (see --help)\n"},
+        {{"--source=replay", "--input=x.hex", "--speed=quick"},
+         "kxserverd: --speed needs a positive number, not \"quick\" (see --help)\n"},
+        {{"--source", "live", "--device", "/dev/null", "--loop"},
+         "kxserverd: --loop does not apply to --source live (see --help)\n"},
+        {{"--source", "replay", "--input", "x.hex", "--seed", "7"},
+         "kxserverd: --seed does not apply to --source replay (see --help)\n"},
+        {{"--seed", "-1"}, "kxserverd: --seed needs a non-negative integer, not \"-1\" (see --help)\n"},
+        {{"--fast=yes"}, "kxserverd: --fast takes no value (see --help)\n"},
+        {{"--input", ""}, "kxserverd: --input needs a value (see --help)\n"},
+    };
+    for (const auto& testCase : cases) {
+        const ProcessResult result = runService(testCase.arguments);
+        EXPECT_EQ(result.exitCode, 2) << testCase.message;
+        EXPECT_EQ(result.err, testCase.message);
+        EXPECT_EQ(result.out, "");
+    }
+}
+
+TEST_F(ServiceArgumentsTest, TheSimulatedBasebandIsRefusedForNow) {
+    const std::string message =
+        "kxserverd: the simulated baseband (--source sim) is not available yet; use --source replay --input "
+        "FILE or --source live --device PATH\n";
+    for (const std::vector<std::string>& arguments : {std::vector<std::string>{},
+                                                      {"--source", "sim", "--seed", "42"},
+                                                      {"--technology", "gsm", "--fast"}}) {
+        const ProcessResult result = runService(arguments);
+        EXPECT_EQ(result.exitCode, 2);
+        EXPECT_EQ(result.err, message);
+    }
+    EXPECT_TRUE(filesIn(runtime_.path()).empty());
+}
+
+TEST_F(ServiceArgumentsTest, ASecondInstanceFindsThePortHeldAndExitsOne) {
+    startService({"--source", "replay", "--input", dataPath("filter.hex")});
+    const ProcessResult second = runService({"--source", "replay", "--input", dataPath("filter.hex")});
+    EXPECT_EQ(second.exitCode, 1);
+    EXPECT_NE(second.err.find("already running"), std::string::npos) << second.err;
+    EXPECT_EQ(linesOf(second.err).size(), 1U) << second.err;
+    // The first one serves on, its socket file untouched.
+    KxTestClient& client = newClient();
+    EXPECT_EQ(client.technology(), std::optional<std::string>("kKxLogChannelTechnology_Orvane_LTE"));
+}
+
+TEST_F(ServiceArgumentsTest, UnreadableInputExitsOneAndLeavesNoSocket) {
+    const ProcessResult result =
+        runService({"--source", "replay", "--input", "/nonexistent/velmar/none.hex"});
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.err,
+              "kxserverd: /nonexistent/velmar/none.hex: cannot open: No such file or directory\n");
+    EXPECT_TRUE(filesIn(runtime_.path()).empty());
+}
+
+TEST_F(ServiceArgumentsTest, ALiveDeviceMustBeACharacterDeviceOrFifo) {
+    const std::string plain = files_.file("plain.qmdl");
+    writeWholeFile(plain, "not a port");
+    const ProcessResult result = runService({"--source", "live", "--device", plain});
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.err, "kxserverd: " + plain + ": not a character device or FIFO\n");
+    const ProcessResult missing = runService({"--source", "live", "--device", files_.file("none")});
+    EXPECT_EQ(missing.exitCode, 1);
+    EXPECT_EQ(missing.err, "kxserverd: " + files_.file("none") + ": No such file or directory\n");
+}
+
+TEST(ServiceOptions, ParsesEveryOptionInBothForms) {
+    const ParsedServiceOptions parsed =
+        parseServiceOptions({"--source", "replay", "--technology=ifx", "--input", "a.qmdl", "--speed=2.5",
+                             "--loop", "--log-stderr"});
+    ASSERT_EQ(parsed.error, "");
+    EXPECT_FALSE(parsed.help);
+    const ServiceOptions& options = parsed.options;
+    EXPECT_EQ(options.source, SourceKind::Replay);
+    EXPECT_EQ(options.technologyName, "ifx");
+    EXPECT_EQ(options.technology, "kKxLogChannelTechnology_IFX");
+    EXPECT_TRUE(options.objectBased);
+    EXPECT_EQ(options.input, "a.qmdl");
+    EXPECT_EQ(options.speed, 2.5);
+    EXPECT_FALSE(options.fast);
+    EXPECT_TRUE(options.loop);
+    EXPECT_TRUE(options.logStderr);
+
+    const ParsedServiceOptions live = parseServiceOptions({"--source=live", "--device", "/dev/diag"});
+    ASSERT_EQ(live.error, "");
+    EXPECT_EQ(live.options.source, SourceKind::Live);
+    EXPECT_EQ(live.options.device, "/dev/diag");
+
+    const ParsedServiceOptions sim = parseServiceOptions({"--seed", "18446744073709551615", "--fast"});
+    ASSERT_EQ(sim.error, "");
+    EXPECT_EQ(sim.options.source, SourceKind::Sim);
+    EXPECT_EQ(sim.options.seed, std::optional<std::uint64_t>(18446744073709551615ULL));
+    EXPECT_TRUE(sim.options.fast);
+    EXPECT_EQ(parseServiceOptions({"--seed", "18446744073709551616"}).error,
+              "--seed needs a non-negative integer, not \"18446744073709551616\"");
+}
+
+TEST(ServiceOptions, MapsEachTechnologyToItsConstant) {
+    const struct {
+        const char* name;
+        const char* constant;
+        bool objectBased;
+    } cases[] = {
+        {"gsm", "kKxLogChannelTechnology_Orvane_GSM", false},
+        {"lte", "kKxLogChannelTechnology_Orvane_LTE", false},
+        {"utran", "kKxLogChannelTechnology_Orvane_UTRAN2", false},
+        {"cdma", "kKxLogChannelTechnology_Orvane_CDMA", false},
+        {"ifx", "kKxLogChannelTechnology_IFX", true},
+    };
+    for (const auto& testCase : cases) {
+        const ParsedServiceOptions parsed =
+            parseServiceOptions({"--technology", testCase.name, "--source", "replay", "--input", "x"});
+        ASSERT_EQ(parsed.error, "") << testCase.name;
+        EXPECT_EQ(parsed.options.technology, testCase.constant);
+        EXPECT_EQ(parsed.options.objectBased, testCase.objectBased) << testCase.name;
+    }
+    const ParsedServiceOptions byDefault = parseServiceOptions({"--source", "replay", "--input", "x"});
+    EXPECT_EQ(byDefault.options.technology, "kKxLogChannelTechnology_Orvane_LTE");
+}
+
+}  // namespace
+}  // namespace velmar::testing

@@ -1,0 +1,17 @@
+// SnapshotFileWriter: writes a snapshot dictionary as an XML property-list file that only its owner can read.
+//
+// Contract: the file is written in place, not atomically (a second save to the same path replaces the first
+// one's contents); it is created with mode 0600, and an existing file is narrowed to 0600 before it is
+// overwritten. Answers false, leaving no half-written document behind where that can be helped, when the
+// value cannot be serialised or the file cannot be opened or fully written.
+#pragma once
+
+#include <string>
+
+#include "core/platform/plist/PlistValue.h"
+
+namespace velmar {
+
+bool writeSnapshotFile(const PlistValue& dictionary, const std::string& path);
+
+}  // namespace velmar

@@ -1,0 +1,68 @@
+// HeadlessFrontEnd: the monitor without a user interface, for scripts and tests.
+//
+// Contract: the navigation stack holds the root pane and, with a followed path /A/B, the panes /A and /A/B
+// above it, as if the user had opened them. After launch and after every redraw one JSON line goes to the
+// output: {"time": "<ISO 8601 local>", "connected": true|false, "status": "<status text>", "tree": NODE},
+// where NODE is the top pane's node, {"name": N, "value": V} for a leaf and {"name": N, "children": [NODE...]}
+// for an inner node, in display order, and null without a tree. A pane whose path has gone is popped, so the
+// top pane, and the tree printed, become its parent's. SIGTERM and SIGINT run the termination sequence.
+#pragma once
+
+#include <cstdio>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "core/platform/PollMainQueue.h"
+#include "ui/Pane.h"
+#include "ui/VelmarShell.h"
+
+namespace velmar {
+
+class HeadlessPane : public Pane {
+public:
+    explicit HeadlessPane(std::string path) : path_(std::move(path)) {}
+    const std::string& path() const override { return path_; }
+    void reloadWithNode(const VelmarModelNodeRef& node) override { node_ = node; }
+    void setStatus(const std::string& status, bool isLoading) override {
+        status_ = status;
+        loading_ = isLoading;
+    }
+    const VelmarModelNodeRef& node() const { return node_; }
+    const std::string& status() const { return status_; }
+    bool isLoading() const { return loading_; }
+
+private:
+    std::string path_;
+    VelmarModelNodeRef node_;
+    std::string status_;
+    bool loading_ = false;
+};
+
+class HeadlessFrontEnd : public NavigationStack {
+public:
+    HeadlessFrontEnd(GeneratorFactory factory, const std::string& followedPath, std::FILE* output);
+    ~HeadlessFrontEnd() override;
+
+    // Launches, turns the main queue until SIGTERM or SIGINT, terminates; answers the exit status.
+    int run();
+
+    std::size_t paneCount() const override { return panes_.size(); }
+    Pane& paneAt(std::size_t index) override { return *panes_.at(index); }
+    void popToPane(std::size_t index, bool animated) override;
+
+    // The JSON line for the current top pane (without the newline).
+    std::string statusLine() const;
+    // The JSON form of one node, as the line carries it.
+    static void appendNodeJson(std::string& out, const VelmarModelNodeRef& node);
+
+private:
+    void printStatusLine();
+
+    PollMainQueue queue_;
+    VelmarShell shell_;
+    std::vector<std::unique_ptr<HeadlessPane>> panes_;
+    std::FILE* output_;
+};
+
+}  // namespace velmar
