@@ -8,7 +8,6 @@ DEBIAN_PACKAGES := build-essential cmake pkg-config clang libclang-rt-14-dev qt6
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 FUZZ_SECONDS ?= 60
 DEMO_TECHNOLOGY ?= lte
-DEMO_CAPTURE ?= samples/captures/lte-connected-1.qmdl
 
 .PHONY: deps build build-asan build-fuzz test test-default test-asan fuzz bench demo format clean
 
@@ -33,7 +32,7 @@ build-asan: deps
 
 build-fuzz: deps
 	cmake --preset fuzz >/dev/null
-	cmake --build --preset fuzz
+	cmake --build --preset fuzz --target fuzzers
 
 test-default: build
 	ctest --preset default
@@ -59,8 +58,24 @@ test: test-default test-asan fuzz
 bench: build
 	@for program in build/default/bench/bench_*; do [ -x "$$program" ] && "$$program"; done
 
-demo: build
-	./build/default/tools/velmar-decode --technology $(DEMO_TECHNOLOGY) $(DEMO_CAPTURE)
+# The live monitor: kxserverd on the simulated baseband (TECH=gsm|lte|utran|cdma|ifx, default lte) in the
+# background, in a runtime directory of its own, and velmar in front (the GUI where a display exists, the
+# terminal UI otherwise). The service stops when velmar ends.
+demo: deps
+	cmake --preset default >/dev/null
+	cmake --build --preset default --target velmar kxserverd
+	@set -u; \
+	technology="$${TECH:-$(DEMO_TECHNOLOGY)}"; \
+	runtime="$$(mktemp -d)"; export VELMAR_RUNTIME_DIR="$$runtime"; \
+	service=""; \
+	stop() { [ -n "$$service" ] && kill "$$service" 2>/dev/null && wait "$$service" 2>/dev/null; rm -rf "$$runtime"; }; \
+	trap stop EXIT; trap 'exit 130' INT TERM; \
+	./build/default/service/kxserverd --source sim --technology "$$technology" 2>"$$runtime/kxserverd.log" & \
+	service=$$!; \
+	for i in $$(seq 50); do [ -S "$$runtime/com.velmar.kxserver" ] && break; \
+	  kill -0 "$$service" 2>/dev/null || break; sleep 0.1; done; \
+	[ -S "$$runtime/com.velmar.kxserver" ] || { echo "make demo: kxserverd did not start:"; cat "$$runtime/kxserverd.log"; exit 1; }; \
+	./build/default/ui/velmar
 
 format:
 	find core LogGenerator logfile tools tests bench fuzz ui service -name '*.cpp' -o -name '*.h' 2>/dev/null \

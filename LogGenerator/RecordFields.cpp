@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <charconv>
+#include <cmath>
 #include <cstdio>
 #include <string_view>
 
@@ -47,6 +48,57 @@ std::string formatNumber(const char* format, std::string_view conversion, Number
     return text;
 }
 
+// A fixed-notation conversion with optional width and precision ("%f", "%.2f", "%4.2f"), alone or followed by
+// a plain suffix ("%4.2f dBm"), is written with to_chars and padded with blanks to the width, as snprintf
+// writes it (to_chars rounds as printf does, ties of exact binary values to even). Flags, longer widths or
+// precisions, other conversions and non-finite values go through snprintf.
+std::string formatFixed(const char* format, double value) {
+    const std::string_view whole(format);
+    std::size_t at = 1;
+    auto number = [&](int& into) {
+        const std::size_t start = at;
+        int parsed = 0;
+        while (at < whole.size() && at - start < 2 && whole[at] >= '0' && whole[at] <= '9') {
+            parsed = parsed * 10 + (whole[at] - '0');
+            ++at;
+        }
+        into = parsed;
+        return at > start;
+    };
+    int width = 0;
+    int precision = 6;
+    if (whole.size() < 2 || whole[0] != '%' || whole[1] == '0' || !std::isfinite(value)) {
+        return formatOne(format, value);
+    }
+    number(width);
+    if (at < whole.size() && whole[at] == '.') {
+        ++at;
+        number(precision);
+    }
+    if (at >= whole.size() || whole[at] != 'f') {
+        return formatOne(format, value);
+    }
+    const std::string_view suffix = whole.substr(at + 1);
+    if (suffix.find('%') != std::string_view::npos) {
+        return formatOne(format, value);
+    }
+    char digits[128];
+    const auto result =
+        std::to_chars(digits, digits + sizeof digits, value, std::chars_format::fixed, precision);
+    if (result.ec != std::errc()) {
+        return formatOne(format, value);
+    }
+    const auto length = static_cast<std::size_t>(result.ptr - digits);
+    const auto wanted = static_cast<std::size_t>(width);
+    const std::size_t padding = wanted > length ? wanted - length : 0;
+    std::string text;
+    text.reserve(padding + length + suffix.size());
+    text.append(padding, ' ');
+    text.append(digits, result.ptr);
+    text.append(suffix);
+    return text;
+}
+
 }  // namespace
 
 std::string ValueNames::nameOf(std::int64_t raw) const {
@@ -68,8 +120,7 @@ std::string ValueFormat::render(std::int64_t raw) const {
         case Kind::Long:
             return formatNumber(format, "%ld", static_cast<long>(raw * multiplier + addend));
         case Kind::Double:
-            return formatNumber(format, "%f", static_cast<double>(raw) * scale + bias,
-                                std::chars_format::fixed, 6);
+            return formatFixed(format, static_cast<double>(raw) * scale + bias);
         case Kind::Names:
             return names->nameOf(raw);
     }

@@ -45,34 +45,45 @@ struct OptionScope {
     bool live;
 };
 
-constexpr std::array<OptionScope, 6> kScopes = {{
+constexpr std::array<OptionScope, 8> kScopes = {{
     {"--input", false, true, false},
     {"--device", false, false, true},
-    {"--speed", true, true, false},
-    {"--fast", true, true, false},
+    {"--speed", false, true, false},
+    {"--fast", false, true, false},
     {"--loop", false, true, false},
     {"--seed", true, false, false},
+    {"--scenario", true, false, false},
+    {"--rate-multiplier", true, false, false},
 }};
+
+constexpr std::array<std::string_view, 3> kScenarios = {"drive", "walk", "static"};
 
 constexpr std::string_view kUsage =
     R"(Usage: kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]
                  [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
+                 [--scenario drive|walk|static] [--rate-multiplier X]
 
 The telephony service: owns one baseband source and serves log channels to monitor clients on the
 control port com.velmar.kxserver (a socket in $VELMAR_RUNTIME_DIR, else $XDG_RUNTIME_DIR/velmar, else
 /tmp/velmar-<uid>). Each client's start command names the log codes and extra codes it receives.
 
-  --source sim|replay|live  where the blobs come from (default: sim, the simulated baseband, which this
-                            build does not have yet: use replay or live)
+  --source sim|replay|live  where the blobs come from (default: sim, the simulated baseband: a device
+                            in a small radio world of cells, logging every record of the technology)
   --technology NAME         the technology answered to GetTechnology: gsm, lte (default), utran, cdma,
-                            or ifx (the object-based technology: every blob goes to every channel)
+                            or ifx (the object-based technology: every blob to every streaming channel)
   --input FILE              replay: the recorded log (hex blob file, DLF, raw diagnostic-port capture or
                             snapshot; told apart by extension, else by content)
-  --speed X                 replay: X times the recorded pace (default 1); blobs without timestamps go
-                            at 50 per second
-  --fast                    replay: as fast as the streaming channels take the blobs
+  --speed X                 replay: X times the recorded pace (default 1). Blobs are paced by their
+                            baseband timestamps, gaps of more than 3 seconds shortened to 3; a blob
+                            without a timestamp follows 1/50 s after the one before it
+  --fast                    replay: as fast as the streaming channels take the blobs, from the first
+                            start command on; a client that stops reading loses only its own oldest blobs
   --loop                    replay: start again at the end (otherwise the service stays up, idle)
-  --seed N                  sim: seed of the simulated baseband
+  --seed N                  sim: seed of the simulated baseband (default 1); the same seed gives the
+                            same cells, route and events
+  --scenario NAME           sim: the device's route: drive (50 km/h, default), walk (5 km/h) or static
+  --rate-multiplier X       sim: simulated time runs X times faster than the wall clock (default 1), and
+                            every logging rate with it
   --device PATH             live: the diagnostic port (character device or FIFO), read as a raw capture
   --log-stderr              also write system-log lines to standard error as "<priority> text";
                             VELMAR_LOG_LEVEL (error, warning, notice, info, debug) sets the threshold
@@ -108,7 +119,7 @@ std::string quoted(std::string_view text) {
     return "\"" + std::string(text) + "\"";
 }
 
-std::optional<double> parseSpeed(const std::string& text) {
+std::optional<double> parsePositiveNumber(const std::string& text) {
     if (text.empty()) {
         return std::nullopt;
     }
@@ -173,7 +184,8 @@ ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& argumen
                 return fail(name + " takes no value");
             }
         } else if (name == "--source" || name == "--technology" || name == "--input" || name == "--speed" ||
-                   name == "--seed" || name == "--device") {
+                   name == "--seed" || name == "--device" || name == "--scenario" ||
+                   name == "--rate-multiplier") {
             if (inlineValue) {
                 value = *inlineValue;
             } else if (index + 1 < arguments.size()) {
@@ -214,7 +226,7 @@ ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& argumen
         } else if (name == "--device") {
             options.device = value;
         } else if (name == "--speed") {
-            const std::optional<double> speed = parseSpeed(value);
+            const std::optional<double> speed = parsePositiveNumber(value);
             if (!speed) {
                 return fail("--speed needs a positive number, not " + quoted(value));
             }
@@ -225,6 +237,18 @@ ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& argumen
                 return fail("--seed needs a non-negative integer, not " + quoted(value));
             }
             options.seed = seed;
+        } else if (name == "--scenario") {
+            const auto found = std::find(kScenarios.begin(), kScenarios.end(), value);
+            if (found == kScenarios.end()) {
+                return fail("unknown scenario " + quoted(value) + " (drive, walk or static)");
+            }
+            options.scenario = *found;
+        } else if (name == "--rate-multiplier") {
+            const std::optional<double> rate = parsePositiveNumber(value);
+            if (!rate) {
+                return fail("--rate-multiplier needs a positive number, not " + quoted(value));
+            }
+            options.rateMultiplier = *rate;
         } else if (name == "--fast") {
             options.fast = true;
         } else if (name == "--loop") {

@@ -2,6 +2,7 @@
 //
 //   kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]
 //             [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
+//             [--scenario drive|walk|static] [--rate-multiplier X]
 //
 // Contract: parseServiceOptions reads the arguments after the program name ("--name value" or
 // "--name=value"). It answers the options, or help (--help anywhere), or a one-line usage error: an unknown
@@ -29,7 +30,9 @@ struct ServiceOptions {
     double speed = 1.0;
     bool fast = false;
     bool loop = false;
-    std::optional<std::uint64_t> seed;
+    std::optional<std::uint64_t> seed;    // the simulated baseband's; 1 when not given
+    std::string_view scenario = "drive";  // the simulated device's route: drive, walk or static
+    double rateMultiplier = 1.0;          // simulated seconds per wall-clock second
     bool logStderr = false;
 };
 

@@ -2,10 +2,25 @@
 
 #include "service/LiveSource.h"
 #include "service/ReplaySource.h"
+#include "service/sim/SimSource.h"
 
 namespace velmar {
 
-std::unique_ptr<BasebandSource> makeBasebandSource(const ServiceOptions& options, std::string& error) {
+namespace {
+
+sim::Scenario scenarioOf(std::string_view name) {
+    if (name == "walk") {
+        return sim::Scenario::Walk;
+    }
+    if (name == "static") {
+        return sim::Scenario::Static;
+    }
+    return sim::Scenario::Drive;
+}
+
+}  // namespace
+
+std::unique_ptr<BasebandSource> makeBasebandSource(const ServiceOptions& options, std::string& /*error*/) {
     switch (options.source) {
         case SourceKind::Replay:
             return std::make_unique<ReplaySource>(
@@ -15,10 +30,9 @@ std::unique_ptr<BasebandSource> makeBasebandSource(const ServiceOptions& options
         case SourceKind::Sim:
             break;
     }
-    error =
-        "the simulated baseband (--source sim) is not available yet; use --source replay --input FILE or "
-        "--source live --device PATH";
-    return nullptr;
+    return std::make_unique<SimSource>(
+        SimSource::Settings{std::string(options.technologyName), options.seed.value_or(1),
+                            scenarioOf(options.scenario), options.rateMultiplier});
 }
 
 }  // namespace velmar

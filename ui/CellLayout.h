@@ -1,12 +1,13 @@
-// CellLayout: where a pane row puts its key and value, for every front end (the GUI in pixels, the terminal in
-// columns, each with its own margin, gap and row height).
+// CellLayout: where a pane row puts its key and value, for every front end (the GUI in pixels, the terminal
+// in columns, each with its own margin, gap and row height).
 //
 // Contract, with the row's content bounds (x, y, w, h) and the measured key (kw, kh) and value (vw, vh):
 // - key-only row (an inner node): key at (x + margin, (h - kh) / 2, kw, kh).
-// - key/value row (a leaf): the key as above; need = kw + margin + gap + vw. When need < w the value sits flush
-//   against the right edge (x = w - vw); otherwise it follows the key (x + margin + kw + gap). The value's y is
-//   (h - vh) / 2. The scrollable content is w + kw + vw wide when need > w, else w, and rowHeight high; the
-//   scroll frame is (x, y, w, rowHeight). Both labels lie inside the scroll frame, in its coordinates.
+// - key/value row (a leaf): the key as above; need = kw + margin + gap + vw. When need < w the value sits
+// flush
+//   against the right edge (x = w - vw); otherwise it follows the key (x + margin + kw + gap). The value's y
+//   is (h - vh) / 2. The scrollable content is w + kw + vw wide when need > w, else w, and rowHeight high;
+//   the scroll frame is (x, y, w, rowHeight). Both labels lie inside the scroll frame, in its coordinates.
 // Divisions truncate toward zero.
 #pragma once
 

@@ -12,7 +12,7 @@
 namespace velmar {
 
 class DiagnosticLogDirectory {
-public:
+  public:
     static std::string path();
     static std::optional<std::string> create();
 };

@@ -2,9 +2,9 @@
 //
 // Contract: the shell asks the presenter to show the one save screen modally over the navigation stack and
 // to take it away again; the presenter builds its own view for the controller and hands it over with
-// VelmarSaveViewController::setView, and clears it (setView(nullptr)) no later than dismissSaveScreen returns,
-// since the controller is released right after. Alerts are the presenter's too: an alert stays up after the
-// save screen has closed, until the user closes it, and it never blocks the main queue.
+// VelmarSaveViewController::setView, and clears it (setView(nullptr)) no later than dismissSaveScreen
+// returns, since the controller is released right after. Alerts are the presenter's too: an alert stays up
+// after the save screen has closed, until the user closes it, and it never blocks the main queue.
 #pragma once
 
 #include <string>
@@ -14,7 +14,7 @@ namespace velmar {
 class VelmarSaveViewController;
 
 class SaveScreenView {
-public:
+  public:
     virtual ~SaveScreenView() = default;
     // The description field's text as typed (UTF-8); empty when nothing was typed.
     virtual std::string descriptionText() const = 0;
@@ -23,7 +23,7 @@ public:
 };
 
 class SaveScreenPresenter {
-public:
+  public:
     virtual ~SaveScreenPresenter() = default;
     virtual void presentSaveScreen(VelmarSaveViewController& controller, bool animated) = 0;
     virtual void dismissSaveScreen(bool animated) = 0;

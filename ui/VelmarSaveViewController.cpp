@@ -35,14 +35,18 @@ void VelmarSaveViewController::hideKeyboard() {
     }
 }
 
-void VelmarSaveViewController::didSelectRow(std::size_t) { hideKeyboard(); }
+void VelmarSaveViewController::didSelectRow(std::size_t) {
+    hideKeyboard();
+}
 
 bool VelmarSaveViewController::textFieldShouldReturn() {
     hideKeyboard();
     return true;
 }
 
-void VelmarSaveViewController::backgroundTouched() { hideKeyboard(); }
+void VelmarSaveViewController::backgroundTouched() {
+    hideKeyboard();
+}
 
 PlistValue VelmarSaveViewController::snapshotDictionary(const std::string& description) const {
     auto snapshot = PlistDictionary::create();
@@ -74,7 +78,9 @@ void VelmarSaveViewController::savePressed() {
     queueCloseSaveView();
 }
 
-void VelmarSaveViewController::cancelPressed() { queueCloseSaveView(); }
+void VelmarSaveViewController::cancelPressed() {
+    queueCloseSaveView();
+}
 
 void VelmarSaveViewController::queueCloseSaveView() {
     VelmarShell& application = application_;

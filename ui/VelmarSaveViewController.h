@@ -7,10 +7,10 @@
 // {"Timestamp", "Data", "Description"} (filled in that order, stopping at the first missing value: no save
 // contents leaves "Timestamp" alone, an empty description leaves it out) as an XML property list to
 // "<diagnostic-log directory>/VelmarSnapshot-<seconds since 1970>.velmar", in place; a failed write is logged
-// ("Unable to write snapshot to %s") and shown as the alert "File Error" / "Unable to write file to disk" with
-// a "Close" button. Save and Cancel both close the screen through the application's closeSaveView, queued on
-// the main queue so that the button's own handling finishes first. Selecting a row, Return in the field and
-// a tap on the background only hide the keyboard.
+// ("Unable to write snapshot to %s") and shown as the alert "File Error" / "Unable to write file to disk"
+// with a "Close" button. Save and Cancel both close the screen through the application's closeSaveView,
+// queued on the main queue so that the button's own handling finishes first. Selecting a row, Return in the
+// field and a tap on the background only hide the keyboard.
 #pragma once
 
 #include <memory>
@@ -24,7 +24,7 @@ namespace velmar {
 class VelmarShell;
 
 class VelmarSaveViewController {
-public:
+  public:
     static constexpr const char* kLayoutName = "VelmarSaveViewController";
     static constexpr const char* kHistoryCellIdentifier = "SaveHistoryContentCell";
     static constexpr const char* kHistoryFontFamily = "Helvetica";
@@ -61,7 +61,7 @@ public:
     // The file's path for a save at the given moment.
     static std::string snapshotPath(const std::string& directory, double secondsSince1970);
 
-private:
+  private:
     void hideKeyboard();
     void queueCloseSaveView();
 

@@ -7,9 +7,9 @@
 // the status "Connecting" with the busy indicator and queues the first restartMonitor on the main queue, so
 // the window is up before the first connection attempt. Redraw: each pane, bottom first, gets its node (the
 // root the top-level nodes, the others the node at their path); a pane whose path has gone pops the stack to
-// its parent and ends the pass. terminate() resets the home screen's "HxShowGSMRSSI" to false and releases the
-// model. At most one save screen exists: showSaveView creates it from the model's save contents and has the
-// front end's presenter show it; closeSaveView has it taken away and releases it.
+// its parent and ends the pass. terminate() resets the home screen's "HxShowGSMRSSI" to false and releases
+// the model. At most one save screen exists: showSaveView creates it from the model's save contents and has
+// the front end's presenter show it; closeSaveView has it taken away and releases it.
 #pragma once
 
 #include <functional>
@@ -24,7 +24,7 @@
 namespace velmar {
 
 class VelmarShell : public VelmarModelDelegate {
-public:
+  public:
     static constexpr const char* kInternalBuildMarker =
         "/BrindleInternal/Library/PreferenceBundles/Carrier Settings.bundle";
     static constexpr const char* kConnectingStatus = "Connecting...";
@@ -50,7 +50,8 @@ public:
     void closeSaveView();
     VelmarSaveViewController* saveViewController() const { return _saveViewController.get(); }
     // Shown by the presenter; without one the alert is only logged.
-    void showAlert(const std::string& title, const std::string& message, const std::string& cancelButtonTitle);
+    void showAlert(const std::string& title, const std::string& message,
+                   const std::string& cancelButtonTitle);
     MainQueue& queue() const { return queue_; }
     // Expires when the shell goes, so that work queued for it can tell.
     std::weak_ptr<bool> aliveToken() const { return alive_; }
@@ -66,7 +67,7 @@ public:
     // The internal-build marker's path, under $VELMAR_SYSROOT when that is set.
     static std::string internalBuildMarkerPath();
 
-private:
+  private:
     GeneratorFactory factory_;
     MainQueue& queue_;
     NavigationStack* _navController = nullptr;

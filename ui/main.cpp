@@ -10,6 +10,7 @@
 #include <string_view>
 
 #include "LogGenerator/LogGenerator.h"
+#include "core/platform/StandardOutputDiversion.h"
 #include "core/platform/SystemLog.h"
 #include "ui/headless/HeadlessFrontEnd.h"
 #ifdef VELMAR_WITH_QT
@@ -46,7 +47,8 @@ constexpr const char* kUsage =
     "                  (internal builds); q quits\n"
     "  --headless      no user interface: after launch and after every redraw, one JSON line on standard\n"
     "                  output: {\"time\", \"connected\", \"status\", \"tree\"}\n"
-    "  --path PATH     with --headless, follow the pane at PATH (e.g. /LTE/Serving Cell Info) instead of the\n"
+    "  --path PATH     with --headless, follow the pane at PATH (e.g. /LTE/Serving Cell Info) instead of "
+    "the\n"
     "                  root; when PATH disappears the pane pops to its parent\n"
     "  --fullscreen    the graphical interface fills the screen (kiosk devices); otherwise its window opens\n"
     "                  at a phone-like size\n"
@@ -78,6 +80,7 @@ int main(int argc, char** argv) {
     std::string followedPath = "/";
     bool fullscreen = false;
     bool pathGiven = false;
+    bool logStderr = false;
     for (int i = 1; i < argc; ++i) {
         const std::string_view argument = argv[i];
         if (argument == "--help" || argument == "-h") {
@@ -97,6 +100,7 @@ int main(int argc, char** argv) {
             fullscreen = true;
         } else if (argument == "--log-stderr") {
             SystemLog::setMirrorToStderr(true);
+            logStderr = true;
         } else if (argument == "--path" && i + 1 < argc) {
             followedPath = argv[++i];
             pathGiven = true;
@@ -104,6 +108,12 @@ int main(int argc, char** argv) {
             std::fprintf(stderr, "velmar: unknown argument '%s' (see --help)\n", argv[i]);
             return 2;
         }
+    }
+    // --path only makes sense when the user asked for the headless front end, not when it was chosen for
+    // want of a display or a terminal.
+    if (pathGiven && frontEnd != FrontEnd::Headless) {
+        std::fputs("velmar: --path goes with --headless (see --help)\n", stderr);
+        return 2;
     }
     if (frontEnd == FrontEnd::Default) {
         const bool display = environmentSet("DISPLAY") || environmentSet("WAYLAND_DISPLAY") ||
@@ -116,35 +126,36 @@ int main(int argc, char** argv) {
             frontEnd = FrontEnd::Headless;
         }
     }
-    if (pathGiven && frontEnd != FrontEnd::Headless) {
-        std::fputs("velmar: --path goes with --headless (see --help)\n", stderr);
-        return 2;
-    }
     if (fullscreen && frontEnd != FrontEnd::Gui) {
-        std::fputs("velmar: --fullscreen needs the graphical interface (a display, and a build with Qt)\n", stderr);
+        std::fputs("velmar: --fullscreen needs the graphical interface (a display, and a build with Qt)\n",
+                   stderr);
         return 2;
     }
 
     switch (frontEnd) {
-    case FrontEnd::Gui:
+        case FrontEnd::Gui:
 #ifdef VELMAR_WITH_QT
-        return runQtFrontEnd(argc, argv, generatorFactory(), fullscreen);
+            return runQtFrontEnd(argc, argv, generatorFactory(), fullscreen);
 #else
-        break;
+            break;
 #endif
-    case FrontEnd::Terminal:
+        case FrontEnd::Terminal:
 #ifdef VELMAR_WITH_TERMINAL
-    {
-        TerminalFrontEnd terminal(generatorFactory());
-        return terminal.run();
-    }
+        {
+            // Declared first so that it outlives the front end and the generators it destroys.
+            const StandardOutputDiversion screenOutput(logStderr);
+            TerminalFrontEnd terminal(generatorFactory());
+            return terminal.run(screenOutput.stream());
+        }
 #else
-        std::fputs("velmar: this build has no terminal interface (see --help)\n", stderr);
-        return 2;
+            std::fputs("velmar: this build has no terminal interface (see --help)\n", stderr);
+            return 2;
 #endif
-    case FrontEnd::Headless:
-    case FrontEnd::Default: break;
+        case FrontEnd::Headless:
+        case FrontEnd::Default:
+            break;
     }
-    HeadlessFrontEnd headless(generatorFactory(), followedPath, stdout);
+    const StandardOutputDiversion jsonOutput(logStderr);
+    HeadlessFrontEnd headless(generatorFactory(), followedPath, jsonOutput.stream());
     return headless.run();
 }

@@ -1,9 +1,9 @@
-// BLER: GSM/UMTS record decoder for the block error counts per transport channel of record 0x4116; key
-// section "BLER" whose channel list is an array value written directly.
+// BLER: the "BLER" key section: the window size and the CRC counts per transport channel of record 0x4116,
+// the channels as an array value of the section (stored even when empty).
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "BLER" at warning priority; other codes log "Received an unknown log message:
+// %d"; a record under 16 bytes changes nothing. The count is not checked against the record's length:
+// entries past the end read as zeros.
 #pragma once
 
 #include "LogGenerator/Base.h"

@@ -1,5 +1,5 @@
 // CellChangeCounters: the "Cell Change Counters" section, a placeholder that takes no codes and shows
-// nothing.
+// nothing; called anyway, it only logs "CellChangeCounters" at warning priority.
 #pragma once
 
 #include "LogGenerator/GSM/PlaceholderDecoder.h"

@@ -8,7 +8,7 @@
 namespace velmar {
 
 void writeNeighbourCellFields(std::span<const NeighbourCellField> fields, const PlistDictionary& cell,
-                            PlistDictionary* target) {
+                              PlistDictionary* target) {
     for (const NeighbourCellField& field : fields) {
         const std::optional<std::int32_t> number = CellInfoArray::cellNumber(cell, field.monitorKey);
         if (!number) {

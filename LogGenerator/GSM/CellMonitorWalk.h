@@ -30,7 +30,7 @@ inline constexpr std::int64_t kCellMonitorNoReading = 32767;
 
 // Writes the fields of one cell into target (if not null), logging the failure of each missing field.
 void writeNeighbourCellFields(std::span<const NeighbourCellField> fields, const PlistDictionary& cell,
-                            PlistDictionary* target);
+                              PlistDictionary* target);
 
 // Parses the record, empties section (whether or not parsing succeeded) and, when it parsed, replaces its
 // content with one row per neighbour cell of the technology, in array order. A row is added even when all of

@@ -1,9 +1,9 @@
-// EquivalentPLMNList: GSM/UMTS record decoder for the equivalent networks of record 0x7150; list section
-// "Equivalent PLMN List".
+// EquivalentPLMNList: the "Equivalent PLMN List" list section, one row per entry of record 0x7150.
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "Equivalent PLMN List" at warning priority; other codes log "Received an unknown
+// log message: %d"; a record under 17 bytes changes nothing. Otherwise the list is emptied and, for a count
+// above zero, replaced whole under the array lock. The count is not checked against the record's length:
+// entries past the end read as zeros.
 #pragma once
 
 #include "LogGenerator/Base.h"

@@ -1,9 +1,10 @@
-// GPRSInformation: GSM/UMTS record decoder for the GPRS/EDGE cell options and TBF parameters from 0x51F5,
-// 0x7135, 0x51F6, 0x51FB, 0x51FD, 0x51F4 and 0x5137; key section "GPRS Information".
+// GPRSInformation: the "GPRS Information" key section: the GPRS cell options, TBF and DRX parameters, PBCCH
+// and packet system information status, and cell reselection hysteresis, from 0x51F5, 0x7135, 0x51F6, 0x51FB,
+// 0x51FD, 0x51F4 and 0x5137.
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "GPRSInformation" at warning priority; other codes (those between the subscribed
+// ones included) log "Received an unknown log message: %d"; records shorter than their code's minimum change
+// nothing.
 #pragma once
 
 #include "LogGenerator/Base.h"

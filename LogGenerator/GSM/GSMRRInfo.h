@@ -1,9 +1,8 @@
-// GSMRRInfo: GSM/UMTS record decoder for the GSM radio-resource state, mode, DTX/DRX and serving-cell quality
-// from 0x512C, 0x5137, 0x5072 and 0x51F6; key section "GSM RR Info".
+// GSMRRInfo: the "GSM RR Info" key section: GSM RR state, sub-state, status and mode (0x512C), serving level
+// and the two quality words (0x5137), DTX (0x5072) and DRX (0x51F6).
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "GSMRRInfo" at warning priority; other codes log "Received an unknown log
+// message: %d"; records shorter than their code's minimum change nothing.
 #pragma once
 
 #include "LogGenerator/Base.h"

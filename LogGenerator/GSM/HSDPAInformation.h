@@ -1,9 +1,9 @@
-// HSDPAInformation: GSM/UMTS record decoder for the HSDPA carrier configuration and per-HARQ-process counters
-// of record 0x4221; key section "HSDPA Info" whose process lists are array values written directly.
+// HSDPAInformation: the "HSDPA Info" key section: version, sub-frame count and carrier configuration of
+// record 0x4221, and its primary and secondary HARQ process lists as array values of the section.
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "HSDPA Info" at warning priority; any other code, and a record under 18 bytes,
+// is ignored without a message. A list whose count is zero keeps the rows shown before. Counts are not
+// checked against the record's length: entries past the end read as zeros.
 #pragma once
 
 #include "LogGenerator/Base.h"

@@ -1,9 +1,8 @@
-// ProcessCO: GSM/UMTS record decoder for common mobility view: the MM state of record 0x7131 and the
-// registration state from 0x7132; key section "Process CO".
+// ProcessCO: the "Process CO" key section, the common mobility view: the MM state of record 0x7131 and the
+// registration state from 0x7132.
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "ProcessCS" at warning priority (the circuit-switched decoder's line, shared on
+// purpose); other codes log "Received an unknown log message: %d"; records under 16 bytes change nothing.
 #pragma once
 
 #include "LogGenerator/Base.h"

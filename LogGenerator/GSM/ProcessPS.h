@@ -1,9 +1,9 @@
-// ProcessPS: GSM/UMTS record decoder for packet-switched mobility state (GMM) from record 0x7130 and the
-// registration state from 0x7132; key section "Process PS".
+// ProcessPS: the "Process PS" key section, the packet-switched (GMM) mobility state: GMM state, sub-state and
+// update status from record 0x7130, and the registration state from 0x7132.
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "ProcessPS" at warning priority; other codes log "Received an unknown log
+// message: %d"; records under 16 bytes change nothing. Values are names from the state tables ("Unknown"
+// beyond them).
 #pragma once
 
 #include "LogGenerator/Base.h"

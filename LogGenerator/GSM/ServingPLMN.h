@@ -1,10 +1,10 @@
-// ServingPLMN: GSM/UMTS record decoder for the registered network: codes, area codes and service type from
-// 0x7135, the selection mode from 0x7132, and the serving cell's codes from the cell-monitor array 0xFF0001;
-// key section "Serving PLMN".
+// ServingPLMN: the "Serving PLMN" key section, the network the phone is registered on: country and network
+// codes digit by digit, area codes and service type from 0x7135, the selection mode from 0x7132, and the
+// codes as plain numbers from the serving GSM or UMTS cell of the cell-monitor array (0xFF0001).
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "Serving PLMN" at warning priority; other codes log "Received an unknown log
+// message: %d"; records shorter than their code's minimum change nothing. A key that one record does not
+// write keeps its earlier value.
 #pragma once
 
 #include "LogGenerator/Base.h"

@@ -1,10 +1,10 @@
-// UMTSRRInfo: GSM/UMTS record decoder for the UMTS RRC state, cell identity and frequencies, ciphering and
-// mean transmit power from 0x4125, 0x4031, 0x4127, 0x4157 and the cell-monitor array 0xFF0001; key section
-// "UMTS RR Info".
+// UMTSRRInfo: the "UMTS RR Info" key section: RRC state (0x4125), mean uplink transmit power (0x4031), cell
+// identity, frequencies and URA (0x4127), ciphering (0x4157) and the serving UMTS cell of the cell-monitor
+// array (0xFF0001).
 //
-// Contract: created through Base::initWithDict; every call logs its entry line at warning priority, a record
-// shorter than its code's minimum length leaves the section untouched, and an unbound decoder runs the same
-// logic and logging but writes nowhere.
+// Contract: every call logs "UMTSRRInfo" at warning priority; other codes log "Received an unknown log
+// message: %d"; records shorter than their code's minimum change nothing. 0x4127 removes the "UARFCN" that
+// the cell-monitor array wrote; the next cell-monitor record writes it again.
 #pragma once
 
 #include "LogGenerator/Base.h"

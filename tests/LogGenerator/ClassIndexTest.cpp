@@ -2,8 +2,8 @@
 
 #include "LogGenerator/NotImplementedError.h"
 #include "core/ArrayLock.h"
-#include "tests/LogGenerator/RecordingDecoder.h"
 #include "core/platform/SystemLog.h"
+#include "tests/LogGenerator/RecordingDecoder.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -22,7 +22,8 @@ std::vector<std::string> sectionsOf(const DecoderList* decoders) {
 }
 
 TEST(ClassIndex, SubscribersAreFoundByDecimalTextOfTheCode) {
-    RecordingClassIndex index({{"A", std::vector<std::int32_t>{45433}}, {"B", std::vector<std::int32_t>{0xFF1234}}});
+    RecordingClassIndex index(
+        {{"A", std::vector<std::int32_t>{45433}}, {"B", std::vector<std::int32_t>{0xFF1234}}});
     EXPECT_EQ(sectionsOf(index.getSubscribers(45433)), std::vector<std::string>{"A"});
     EXPECT_EQ(sectionsOf(index.getSubscribers(0xFF0000 + 0x1234)), std::vector<std::string>{"B"});
     EXPECT_EQ(index.getAllLogCodes(), (std::vector<std::string>{"45433", "16716340"}));
@@ -33,11 +34,13 @@ TEST(ClassIndex, DecodersSharingACodeAreCalledInCreationOrder) {
     RecordingClassIndex index({{"First", std::vector<std::int32_t>{7, 9}},
                                {"Second", std::vector<std::int32_t>{9}},
                                {"Twice", std::vector<std::int32_t>{9, 9}}});
-    EXPECT_EQ(sectionsOf(index.getSubscribers(9)), (std::vector<std::string>{"First", "Second", "Twice", "Twice"}));
+    EXPECT_EQ(sectionsOf(index.getSubscribers(9)),
+              (std::vector<std::string>{"First", "Second", "Twice", "Twice"}));
 }
 
 TEST(ClassIndex, GetClassFindsDecoderBySectionNameAndLaterNameReplacesEarlier) {
-    RecordingClassIndex index({{"Same", std::vector<std::int32_t>{1}}, {"Same", std::vector<std::int32_t>{2}}});
+    RecordingClassIndex index(
+        {{"Same", std::vector<std::int32_t>{1}}, {"Same", std::vector<std::int32_t>{2}}});
     ASSERT_NE(index.getClass("Same"), nullptr);
     EXPECT_EQ(index.getClass("Same"), index.getSubscribers(2)->at(0).get());
     // The replaced decoder stays subscribed.
@@ -118,6 +121,28 @@ TEST(Base, LookUpECNOThresholds) {
     EXPECT_EQ(Base::lookUpECNO(757), -31);
     EXPECT_EQ(Base::lookUpECNO(706), -31);
     EXPECT_EQ(Base::lookUpECNO(705), 0);
+}
+
+TEST(Base, LookUpECNOEveryRowFromItsLowestValue) {
+    // The lowest value of each row, with that row's result; one less falls into the next row down.
+    struct Row {
+        std::uint32_t lowest;
+        std::int16_t decibels;
+    };
+    const Row rows[] = {
+        {524288, 0},  {417648, -1}, {331809, -2}, {263625, -3}, {209464, -4}, {166442, -5}, {132269, -6},
+        {105124, -7}, {83563, -8},  {66436, -9},  {52831, -10}, {42024, -11}, {33441, -12}, {26622, -13},
+        {21206, -14}, {16904, -15}, {13487, -16}, {10772, -17}, {8616, -18},  {6903, -19},  {5543, -20},
+        {4462, -21},  {3604, -22},  {2922, -23},  {2241, -24},  {1950, -25},  {1608, -26},  {1337, -27},
+        {1121, -28},  {950, -29},   {814, -30},   {757, -31},   {706, -31},
+    };
+    const std::size_t count = sizeof(rows) / sizeof(rows[0]);
+    for (std::size_t i = 0; i < count; ++i) {
+        EXPECT_EQ(Base::lookUpECNO(rows[i].lowest), rows[i].decibels) << rows[i].lowest;
+        const std::int16_t below = i + 1 < count ? rows[i + 1].decibels : 0;
+        EXPECT_EQ(Base::lookUpECNO(rows[i].lowest - 1), below) << rows[i].lowest - 1;
+    }
+    EXPECT_EQ(Base::lookUpECNO(1), 0);
 }
 
 }  // namespace

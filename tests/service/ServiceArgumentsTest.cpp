@@ -1,5 +1,5 @@
-// kxserverd's command line, as a process: help, usage errors, the source this build does not have yet, a
-// second instance and sources that cannot start.
+// kxserverd's command line, as a process: help, usage errors, the simulator's options, a second instance
+// and sources that cannot start.
 #include <gtest/gtest.h>
 
 #include <dirent.h>
@@ -8,8 +8,8 @@
 #include <vector>
 
 #include "service/ServiceOptions.h"
-#include "tests/service/ServiceTestFixture.h"
 #include "tests/support/Process.h"
+#include "tests/support/ServiceTestFixture.h"
 
 namespace velmar::testing {
 namespace {
@@ -85,18 +85,58 @@ TEST_F(ServiceArgumentsTest, UsageErrorsPrintOneLineAndExitTwo) {
     }
 }
 
-TEST_F(ServiceArgumentsTest, TheSimulatedBasebandIsRefusedForNow) {
-    const std::string message =
-        "kxserverd: the simulated baseband (--source sim) is not available yet; use --source replay --input "
-        "FILE or --source live --device PATH\n";
-    for (const std::vector<std::string>& arguments : {std::vector<std::string>{},
-                                                      {"--source", "sim", "--seed", "42"},
-                                                      {"--technology", "gsm", "--fast"}}) {
-        const ProcessResult result = runService(arguments);
-        EXPECT_EQ(result.exitCode, 2);
-        EXPECT_EQ(result.err, message);
+TEST_F(ServiceArgumentsTest, TheSimulatorsOptionsAreCheckedAndApplyOnlyToIt) {
+    const struct {
+        std::vector<std::string> arguments;
+        std::string message;
+    } cases[] = {
+        {{"--scenario", "run"}, "kxserverd: unknown scenario \"run\" (drive, walk or static) (see --help)\n"},
+        {{"--scenario"}, "kxserverd: --scenario needs a value (see --help)\n"},
+        {{"--rate-multiplier", "0"},
+         "kxserverd: --rate-multiplier needs a positive number, not \"0\" (see --help)\n"},
+        {{"--rate-multiplier=-2"},
+         "kxserverd: --rate-multiplier needs a positive number, not \"-2\" (see --help)\n"},
+        {{"--rate-multiplier", "fast"},
+         "kxserverd: --rate-multiplier needs a positive number, not \"fast\" (see --help)\n"},
+        {{"--source", "replay", "--input", "x.hex", "--scenario", "walk"},
+         "kxserverd: --scenario does not apply to --source replay (see --help)\n"},
+        {{"--source", "live", "--device", "/dev/null", "--rate-multiplier", "2"},
+         "kxserverd: --rate-multiplier does not apply to --source live (see --help)\n"},
+        {{"--fast"}, "kxserverd: --fast does not apply to --source sim (see --help)\n"},
+        {{"--source", "sim", "--speed", "2"},
+         "kxserverd: --speed does not apply to --source sim (see --help)\n"},
+    };
+    for (const auto& testCase : cases) {
+        const ProcessResult result = runService(testCase.arguments);
+        EXPECT_EQ(result.exitCode, 2) << testCase.message;
+        EXPECT_EQ(result.err, testCase.message);
+        EXPECT_EQ(result.out, "");
     }
     EXPECT_TRUE(filesIn(runtime_.path()).empty());
+}
+
+TEST(ServiceOptions, TheSimulatedBasebandIsTheDefaultSource) {
+    const ParsedServiceOptions byDefault = parseServiceOptions({});
+    ASSERT_EQ(byDefault.error, "");
+    EXPECT_EQ(byDefault.options.source, SourceKind::Sim);
+    EXPECT_EQ(byDefault.options.technologyName, "lte");
+    EXPECT_EQ(byDefault.options.scenario, "drive");
+    EXPECT_EQ(byDefault.options.rateMultiplier, 1.0);
+    EXPECT_EQ(byDefault.options.seed, std::nullopt);
+
+    const ParsedServiceOptions sim =
+        parseServiceOptions({"--source=sim", "--scenario", "walk", "--rate-multiplier=2.5", "--seed", "7"});
+    ASSERT_EQ(sim.error, "");
+    EXPECT_EQ(sim.options.scenario, "walk");
+    EXPECT_EQ(sim.options.rateMultiplier, 2.5);
+    EXPECT_EQ(sim.options.seed, std::optional<std::uint64_t>(7));
+    EXPECT_EQ(parseServiceOptions({"--scenario=static"}).options.scenario, "static");
+}
+
+TEST_F(ServiceArgumentsTest, TheHelpNamesTheSimulatorsOptions) {
+    const std::vector<std::string> lines = linesOf(runService({"--help"}).out);
+    ASSERT_GE(lines.size(), 3U);
+    EXPECT_EQ(lines[2], "                 [--scenario drive|walk|static] [--rate-multiplier X]");
 }
 
 TEST_F(ServiceArgumentsTest, ASecondInstanceFindsThePortHeldAndExitsOne) {
@@ -152,11 +192,12 @@ TEST(ServiceOptions, ParsesEveryOptionInBothForms) {
     EXPECT_EQ(live.options.source, SourceKind::Live);
     EXPECT_EQ(live.options.device, "/dev/diag");
 
-    const ParsedServiceOptions sim = parseServiceOptions({"--seed", "18446744073709551615", "--fast"});
+    const ParsedServiceOptions sim =
+        parseServiceOptions({"--seed", "18446744073709551615", "--rate-multiplier", "4"});
     ASSERT_EQ(sim.error, "");
     EXPECT_EQ(sim.options.source, SourceKind::Sim);
     EXPECT_EQ(sim.options.seed, std::optional<std::uint64_t>(18446744073709551615ULL));
-    EXPECT_TRUE(sim.options.fast);
+    EXPECT_EQ(sim.options.rateMultiplier, 4.0);
     EXPECT_EQ(parseServiceOptions({"--seed", "18446744073709551616"}).error,
               "--seed needs a non-negative integer, not \"18446744073709551616\"");
 }

@@ -15,7 +15,7 @@
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/MessagePort.h"
 #include "core/platform/plist/PlistCodec.h"
-#include "tests/service/ServiceTestFixture.h"
+#include "tests/support/ServiceTestFixture.h"
 
 namespace velmar::testing {
 namespace {

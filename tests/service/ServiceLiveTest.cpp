@@ -10,7 +10,7 @@
 #include <thread>
 #include <vector>
 
-#include "tests/service/ServiceTestFixture.h"
+#include "tests/support/ServiceTestFixture.h"
 
 namespace velmar::testing {
 namespace {

@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "tests/service/ServiceTestFixture.h"
+#include "tests/support/ServiceTestFixture.h"
 
 namespace velmar::testing {
 namespace {

@@ -20,8 +20,12 @@ using testing::runProcess;
 
 const std::string kDecode = VELMAR_DECODE_PATH;
 
-std::string dataFile(const std::string& name) { return testing::testDataPath("decode/" + name); }
-std::string capture(const std::string& name) { return std::string(VELMAR_SOURCE_DIR) + "/samples/captures/" + name; }
+std::string dataFile(const std::string& name) {
+    return testing::testDataPath("decode/" + name);
+}
+std::string capture(const std::string& name) {
+    return std::string(VELMAR_SOURCE_DIR) + "/samples/captures/" + name;
+}
 
 std::vector<std::string> lines(const std::string& text) {
     std::vector<std::string> out;
@@ -95,7 +99,8 @@ TEST(DecodeTool, StartCommandIsPrintedAsJson) {
 }
 
 TEST(DecodeTool, EveryTickPrintsOneLinePerRefresh) {
-    const auto result = runProcess({kDecode, "--technology", "lte", "--every-tick", dataFile("two-intervals.hex")});
+    const auto result =
+        runProcess({kDecode, "--technology", "lte", "--every-tick", dataFile("two-intervals.hex")});
     ASSERT_EQ(result.exitCode, 0) << result.err;
     const auto printed = lines(result.out);
     ASSERT_EQ(printed.size(), 2u);  // the tick, then the refresh after the last blob
@@ -110,6 +115,17 @@ TEST(DecodeTool, StandardOutputHoldsJsonOnly) {
     ASSERT_EQ(result.exitCode, 0) << result.err;
     EXPECT_TRUE(parseJson(result.out).has_value());
     EXPECT_EQ(result.out.find("Deallocing"), std::string::npos);
+    EXPECT_EQ(result.err, "");
+}
+
+TEST(DecodeTool, TheGeneratorsOwnLinesGoToStandardErrorWithLogStderr) {
+    const auto result =
+        runProcess({kDecode, "--technology", "lte", "--log-stderr", dataFile("two-intervals.hex")});
+    ASSERT_EQ(result.exitCode, 0) << result.err;
+    EXPECT_TRUE(parseJson(result.out).has_value());
+    EXPECT_EQ(result.out.find("Deallocing"), std::string::npos);
+    EXPECT_NE(result.err.find("Deallocing LTEClassIndex\nDeallocing ClassIndex\n"), std::string::npos)
+        << result.err;
 }
 
 TEST(DecodeTool, StateOutputHoldsTheStateKeys) {
@@ -131,7 +147,8 @@ TEST(DecodeTool, StateOutputHoldsTheStateKeys) {
 }
 
 TEST(DecodeTool, SaveContentsEndWithTheDlfFile) {
-    const auto result = runProcess({kDecode, "--technology", "lte", "--save-contents", dataFile("two-intervals.hex")});
+    const auto result =
+        runProcess({kDecode, "--technology", "lte", "--save-contents", dataFile("two-intervals.hex")});
     ASSERT_EQ(result.exitCode, 0) << result.err;
     const auto contents = parseJson(result.out);
     ASSERT_TRUE(contents && contents->isArray());
@@ -154,18 +171,21 @@ TEST(DecodeTool, DlfInputIsFedAsLogPackets) {
     testing::TemporaryDirectory directory;
     // Two DLF records: a serving-cell record and one of an unknown code.
     std::string dlf;
-    const std::vector<std::uint8_t> serving{0x25, 0x00, 0xC2, 0xB0, 0, 0, 0, 0, 0, 0, 0, 0, 0x01, 0xF4, 0x01,
-                                            0x2C, 0x01, 0x4E, 0x4B, 0x64, 0x64, 0x78, 0x56, 0x34, 0x12, 0x39,
-                                            0x30, 0x03, 0, 0, 0, 0, 0, 0, 0, 0, 0};
+    const std::vector<std::uint8_t> serving{0x25, 0x00, 0xC2, 0xB0, 0,    0,    0,    0,    0,    0,
+                                            0,    0,    0x01, 0xF4, 0x01, 0x2C, 0x01, 0x4E, 0x4B, 0x64,
+                                            0x64, 0x78, 0x56, 0x34, 0x12, 0x39, 0x30, 0x03, 0,    0,
+                                            0,    0,    0,    0,    0,    0,    0};
     dlf.append(serving.begin(), serving.end());
     const std::vector<std::uint8_t> unknown{0x0C, 0x00, 0x34, 0x12, 0, 0, 0, 0, 0, 0, 0, 0};
     dlf.append(unknown.begin(), unknown.end());
     testing::writeWholeFile(directory.file("trace.dlf"), dlf);
-    const auto result = runProcess({kDecode, "--technology", "lte", "--output", "state", directory.file("trace.dlf")});
+    const auto result =
+        runProcess({kDecode, "--technology", "lte", "--output", "state", directory.file("trace.dlf")});
     ASSERT_EQ(result.exitCode, 0) << result.err;
     const auto state = parseJson(result.out);
     ASSERT_TRUE(state);
-    const auto bytes = decodeBase64(*state->dictionary()->get("DisplayState").dictionary()->get("$data").string());
+    const auto bytes =
+        decodeBase64(*state->dictionary()->get("DisplayState").dictionary()->get("$data").string());
     ASSERT_TRUE(bytes);
     EXPECT_EQ(bytes->size(), 1u + 37u + 1u + 12u);
     EXPECT_EQ((*bytes)[0], 1);
@@ -183,7 +203,8 @@ TEST(DecodeTool, RealCaptureDecodesWithoutError) {
 
 TEST(DecodeTool, SnapshotFileReplaysItsHistory) {
     testing::TemporaryDirectory directory;
-    const auto saved = runProcess({kDecode, "--technology", "lte", "--save-contents", dataFile("two-intervals.hex")});
+    const auto saved =
+        runProcess({kDecode, "--technology", "lte", "--save-contents", dataFile("two-intervals.hex")});
     ASSERT_EQ(saved.exitCode, 0);
     // Rebuild a snapshot file from the history entries' raw data, as the save screen writes it.
     const auto contents = parseJson(saved.out);
@@ -195,7 +216,8 @@ TEST(DecodeTool, SnapshotFileReplaysItsHistory) {
             continue;
         }
         auto rebuilt = PlistDictionary::create();
-        rebuilt->set("DisplayState", PlistValue::data(*decodeBase64(*raw->dictionary()->get("$data").string())));
+        rebuilt->set("DisplayState",
+                     PlistValue::data(*decodeBase64(*raw->dictionary()->get("$data").string())));
         rebuilt->set("Description", *entry.dictionary()->get("Description").string());
         data->append(rebuilt);
     }
@@ -205,8 +227,8 @@ TEST(DecodeTool, SnapshotFileReplaysItsHistory) {
     snapshot->set("Description", "drive test");
     ASSERT_TRUE(writeXmlFile(snapshot, directory.file("saved.velmar")));
 
-    const auto replayed = runProcess(
-        {kDecode, "--technology", "lte", "--output", "state", "--every-tick", directory.file("saved.velmar")});
+    const auto replayed = runProcess({kDecode, "--technology", "lte", "--output", "state", "--every-tick",
+                                      directory.file("saved.velmar")});
     ASSERT_EQ(replayed.exitCode, 0) << replayed.err;
     EXPECT_EQ(lines(replayed.out).size(), 3u);  // a refresh after each of the two entries, and the last one
 }

@@ -21,27 +21,27 @@ namespace velmar {
 namespace {
 
 class StillPane : public Pane {
-public:
+  public:
     const std::string& path() const override { return path_; }
     void reloadWithNode(const VelmarModelNodeRef&) override {}
     void setStatus(const std::string&, bool) override {}
 
-private:
+  private:
     std::string path_ = "/";
 };
 
 class OnePaneStack : public NavigationStack {
-public:
+  public:
     std::size_t paneCount() const override { return 1; }
     Pane& paneAt(std::size_t) override { return pane_; }
     void popToPane(std::size_t, bool) override {}
 
-private:
+  private:
     StillPane pane_;
 };
 
 class FakeSaveView : public SaveScreenView {
-public:
+  public:
     std::string descriptionText() const override { return text; }
     void resignDescriptionFocus() override { ++resigned; }
     std::string text;
@@ -50,7 +50,7 @@ public:
 
 // Presents by attaching a fake view; records dismissals and alerts.
 class RecordingPresenter : public SaveScreenPresenter {
-public:
+  public:
     void presentSaveScreen(VelmarSaveViewController& controller, bool animated) override {
         ++presented;
         presentedAnimated = animated;
@@ -80,9 +80,11 @@ public:
 
 // A generator whose save contents are two history entries and the DLF entry.
 class HistoryGenerator : public MonitorGenerator {
-public:
+  public:
     void updateState(const PlistDictionaryRef&, ByteView) override {}
-    PlistValue generateLogUsingState(const PlistDictionaryRef&) override { return PlistValue::newDictionary(); }
+    PlistValue generateLogUsingState(const PlistDictionaryRef&) override {
+        return PlistValue::newDictionary();
+    }
     PlistValue getStartCommand() override {
         auto command = PlistDictionary::create();
         command->set("SetState", "Streaming");
@@ -143,7 +145,7 @@ std::vector<std::string> keysOf(const PlistValue& dictionary) {
 }
 
 class SaveFlowTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override {
         setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
         setenv("XDG_CONFIG_HOME", config_.path().c_str(), 1);
@@ -392,7 +394,8 @@ TEST_F(SaveFlowTest, AFailedWriteIsLoggedShownAsAnAlertAndTheScreenClosesAnyway)
     EXPECT_EQ(capture.textsAt(kLogError),
               std::vector<std::string>{"Unable to write snapshot to " + state_.path() +
                                        "/blocked/velmar/diagnostics/VelmarSnapshot-1790000000.velmar"});
-    EXPECT_EQ(presenter_.alerts, std::vector<std::string>{"File Error / Unable to write file to disk / Close"});
+    EXPECT_EQ(presenter_.alerts,
+              std::vector<std::string>{"File Error / Unable to write file to disk / Close"});
     queue_.runFor(0.05);
     EXPECT_EQ(shell_.saveViewController(), nullptr);
     EXPECT_EQ(presenter_.dismissed, 1);

@@ -1,11 +1,9 @@
 // velmar-decode: feeds recorded baseband blobs through a technology's generator, exactly as the monitor's
 // model does, and prints the display (or the whole state, or the save contents) as JSON.
 //
-// Standard output carries JSON only: the generator family writes a few lines of its own to the C library's
-// standard output when it is destroyed, so the JSON goes to a duplicate of the original descriptor and
-// descriptor 1 is pointed at standard error for the rest of the run.
-#include <unistd.h>
-
+// Standard output carries JSON only (StandardOutputDiversion): the generator family's own lines go to
+// standard error with --log-stderr, like the log lines, and nowhere otherwise, so that a failure prints one
+// line only.
 #include <cstdio>
 #include <memory>
 #include <string>
@@ -13,6 +11,7 @@
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/Json.h"
+#include "core/platform/StandardOutputDiversion.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/LogFormat.h"
 #include "tools/decode/DecodeOptions.h"
@@ -24,34 +23,18 @@ constexpr int kExitUsageOrInput = 2;
 constexpr int kPrettyIndent = 2;
 
 class JsonOutput {
-public:
-    JsonOutput() {
-        std::fflush(stdout);
-        const int jsonDescriptor = dup(STDOUT_FILENO);
-        out_ = jsonDescriptor >= 0 ? fdopen(jsonDescriptor, "w") : nullptr;
-        if (out_ == nullptr) {
-            out_ = stdout;
-            return;
-        }
-        dup2(STDERR_FILENO, STDOUT_FILENO);
-    }
-    ~JsonOutput() {
-        if (out_ != stdout) {
-            std::fclose(out_);
-        }
-    }
-    JsonOutput(const JsonOutput&) = delete;
-    JsonOutput& operator=(const JsonOutput&) = delete;
+  public:
+    explicit JsonOutput(bool diagnosticsToStderr) : diversion_(diagnosticsToStderr) {}
 
     void write(const PlistValue& value, int indent) {
         std::string text = plistToJson(value, indent);
         text.push_back('\n');
-        std::fwrite(text.data(), 1, text.size(), out_);
-        std::fflush(out_);
+        std::fwrite(text.data(), 1, text.size(), diversion_.stream());
+        std::fflush(diversion_.stream());
     }
 
-private:
-    std::FILE* out_ = nullptr;
+  private:
+    StandardOutputDiversion diversion_;
 };
 
 int fail(const std::string& message) {
@@ -70,9 +53,10 @@ void reportCaptureStatistics(const std::string& path, const LogReadStats& stats)
                    static_cast<unsigned long long>(stats.wrappedFrames),
                    static_cast<unsigned long long>(stats.badFrames));
     if (stats.badFrames > 0) {
-        SystemLog::log(kLogError, "%s: %llu bad frames skipped (first at offset %llu)", path.c_str(),
-                       static_cast<unsigned long long>(stats.badFrames),
-                       static_cast<unsigned long long>(stats.badFrameOffsets.empty() ? 0 : stats.badFrameOffsets[0]));
+        SystemLog::log(
+            kLogError, "%s: %llu bad frames skipped (first at offset %llu)", path.c_str(),
+            static_cast<unsigned long long>(stats.badFrames),
+            static_cast<unsigned long long>(stats.badFrameOffsets.empty() ? 0 : stats.badFrameOffsets[0]));
     }
     for (const std::string& problem : stats.problems) {
         SystemLog::log(kLogError, "%s", problem.c_str());
@@ -80,7 +64,7 @@ void reportCaptureStatistics(const std::string& path, const LogReadStats& stats)
 }
 
 int run(const DecodeOptions& options) {
-    JsonOutput json;
+    JsonOutput json(options.logStderr);
     std::unique_ptr<LogGenerator> generator =
         LogGenerator::generatorFromTechnology(technologyConstantFor(options.technology));
     if (!generator) {

@@ -16,9 +16,9 @@ namespace velmar {
 namespace {
 
 using gsm_testing::KeySectionDecoder;
-using testing::LogCapture;
 using gsm_testing::rowOf;
 using gsm_testing::textAt;
+using testing::LogCapture;
 
 const std::string kGsm(kKxCellMonitorRadioAccessTechnologyGSM);
 const std::string kUmts(kKxCellMonitorRadioAccessTechnologyUMTS);

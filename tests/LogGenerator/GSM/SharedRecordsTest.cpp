@@ -20,8 +20,8 @@ namespace {
 
 using gsm_testing::KeySectionDecoder;
 using gsm_testing::ListSectionDecoder;
-using testing::LogCapture;
 using gsm_testing::rowOf;
+using testing::LogCapture;
 
 TEST(SimInfo, OnlyTheIccidChangesOnlyEfIccid) {
     KeySectionDecoder<SimInfo> sim;

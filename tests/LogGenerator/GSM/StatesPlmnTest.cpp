@@ -253,6 +253,28 @@ TEST(StatesPlmn, CellMonitorMissingKeysLogAndContinue) {
     EXPECT_EQ(serving.text("Location Area Code"), "0");
 }
 
+TEST(StatesPlmn, CellMonitorMissingNetworkCodeLogsAndKeepsTheOldOne) {
+    KeySectionHarness<ServingPLMN> serving;
+    // MCC 310, MNC 41 (two digits, so the third is a blank), LAC 0x0102 = 258.
+    serving.feed(RecordBuilder(0x7135)
+                     .u8(15, 0x13)
+                     .u8(16, 0xF0)
+                     .u8(17, 0x14)
+                     .u8(18, 0x01)
+                     .u8(19, 0x02)
+                     .resize(32)
+                     .build());
+    ASSERT_EQ(serving.text("Mobile Network Code"), "41 ");
+    LogCapture capture;
+    serving.feed(
+        testing::cellMonitorRecord({{.technology = kGsm, .cellType = kServing, .mcc = 234, .lac = 9}}));
+    EXPECT_EQ(capture.lines(),
+              (Lines{{kLogWarning, "Serving PLMN"}, {kLogError, "ServingPLMN: Failed to retrieve MNC\n"}}));
+    EXPECT_EQ(serving.text("Mobile Country Code"), "234");
+    EXPECT_EQ(serving.text("Mobile Network Code"), "41 ");
+    EXPECT_EQ(serving.text("Location Area Code"), "9");
+}
+
 TEST(StatesPlmn, CellMonitorKeysOfTheWrongType) {
     KeySectionHarness<ServingPLMN> serving;
     auto wrongTechnology = PlistDictionary::create();

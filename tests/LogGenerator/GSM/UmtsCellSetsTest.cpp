@@ -22,9 +22,9 @@ namespace velmar {
 namespace {
 
 using gsm_testing::ListSectionDecoder;
-using testing::LogCapture;
 using gsm_testing::rowOf;
 using gsm_testing::rowsOf;
+using testing::LogCapture;
 
 const std::string kGsm(kKxCellMonitorRadioAccessTechnologyGSM);
 const std::string kUmts(kKxCellMonitorRadioAccessTechnologyUMTS);

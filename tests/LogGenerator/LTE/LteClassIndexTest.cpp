@@ -10,6 +10,7 @@
 #include "core/platform/StringFormat.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
+#include "logfile/records/LteRecords.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -111,6 +112,29 @@ TEST(LteLogGenerator, FactoryCreatesItForTheLteTechnology) {
     auto generator = LogGenerator::generatorFromTechnology(kKxLogChannelTechnology_Orvane_LTE);
     ASSERT_NE(generator, nullptr);
     EXPECT_NE(dynamic_cast<LTELogGenerator*>(generator.get()), nullptr);
+}
+
+TEST(LteLogGenerator, DecodesIntoTheTemplateDisplay) {
+    LTELogGenerator generator;
+    const StateDict state = PlistDictionary::create();
+    LteServingCellInfoRecord serving;
+    serving.physicalCellId = 88;
+    serving.downlinkBandwidth = 75;
+    generator.updateState(state, buildLteServingCellInfoRecord(serving));
+    LteIntraFrequencyRecord connected;
+    connected.measured = {{5, 6, 7}};
+    generator.updateState(state, buildLteIntraFrequencyRecord(connected));
+    // The first blob built the display, so the first refresh already returns it.
+    const PlistValue display = generator.generateLogUsingState(state);
+    ASSERT_TRUE(display.isDictionary());
+    const auto& servingGroup = *display.dictionary()->get("Serving Cell").dictionary();
+    EXPECT_EQ(*servingGroup.get("Serving Cell Info").dictionary()->get("Physical Cell ID").string(), "88");
+    EXPECT_EQ(*servingGroup.get("Serving Cell Info").dictionary()->get("Download Bandwidth").string(),
+              "15 MHz");
+    const auto& neighbours = *display.dictionary()->get("Neighbor Cells").dictionary();
+    ASSERT_EQ(neighbours.get("Measured Neighbor Cells").array()->size(), 1u);
+    EXPECT_TRUE(neighbours.get("Detected Cells").array()->empty());
+    EXPECT_TRUE(display.dictionary()->get("PDP Context Info").array()->empty());
 }
 
 TEST(LteLogGenerator, StartCommandSplitsPlainAndExtraCodes) {

@@ -11,8 +11,8 @@
 #include <vector>
 
 #include "core/platform/PollMainQueue.h"
-#include "tests/service/KxTestClient.h"
-#include "tests/service/ServiceProcess.h"
+#include "tests/support/KxTestClient.h"
+#include "tests/support/ServiceProcess.h"
 #include "tests/support/TestPaths.h"
 
 namespace velmar::testing {

@@ -1,4 +1,4 @@
-#include "tests/service/KxTestClient.h"
+#include "tests/support/KxTestClient.h"
 
 #include <set>
 

@@ -1,4 +1,4 @@
-#include "tests/service/ServiceProcess.h"
+#include "tests/support/BackgroundProcess.h"
 
 #include <fcntl.h>
 #include <signal.h>
@@ -10,8 +10,6 @@
 #include <sstream>
 #include <thread>
 
-#include "core/platform/KxServerProtocol.h"
-#include "core/platform/MessagePort.h"
 #include "tests/support/TestPaths.h"
 
 extern char** environ;
@@ -32,11 +30,37 @@ void pause() {
 
 }  // namespace
 
-ServiceProcess::ServiceProcess(const std::vector<std::string>& arguments, const std::string& directory,
-                               const std::vector<std::string>& environment)
-    : errPath_(directory + "/kxserverd.err"), outPath_(directory + "/kxserverd.out") {
+bool waitUntil(const std::function<bool()>& holds, double timeoutSeconds) {
+    const auto deadline = deadlineAfter(timeoutSeconds);
+    for (;;) {
+        if (holds()) {
+            return true;
+        }
+        if (Clock::now() >= deadline) {
+            return false;
+        }
+        pause();
+    }
+}
+
+namespace {}  // namespace
+
+namespace {
+
+std::string baseName(const std::string& path) {
+    const std::size_t slash = path.rfind('/');
+    return slash == std::string::npos ? path : path.substr(slash + 1);
+}
+
+}  // namespace
+
+BackgroundProcess::BackgroundProcess(const std::string& program, const std::vector<std::string>& arguments,
+                                     const std::string& directory,
+                                     const std::vector<std::string>& environment)
+    : errPath_(directory + "/" + baseName(program) + ".err"),
+      outPath_(directory + "/" + baseName(program) + ".out") {
     // Everything the child needs is built before fork: after it, only system calls.
-    std::vector<std::string> argumentStrings{KXSERVERD_PATH};
+    std::vector<std::string> argumentStrings{program};
     argumentStrings.insert(argumentStrings.end(), arguments.begin(), arguments.end());
     std::vector<char*> argv;
     for (std::string& argument : argumentStrings) {
@@ -78,7 +102,7 @@ ServiceProcess::ServiceProcess(const std::vector<std::string>& arguments, const 
     close(nullFd);
 }
 
-ServiceProcess::~ServiceProcess() {
+BackgroundProcess::~BackgroundProcess() {
     if (pid_ > 0 && !exitCode_) {
         kill(pid_, SIGKILL);
         int status = 0;
@@ -86,47 +110,29 @@ ServiceProcess::~ServiceProcess() {
     }
 }
 
-bool ServiceProcess::waitUntilServing(double timeoutSeconds) {
-    const auto deadline = deadlineAfter(timeoutSeconds);
-    while (Clock::now() < deadline) {
-        if (MessagePort::createRemote(std::string(kKxServerControlPortName))) {
-            return true;
-        }
-        if (waitForExit(0)) {
-            return false;
-        }
-        pause();
-    }
-    return false;
+bool BackgroundProcess::waitForError(const std::string& text, double timeoutSeconds) {
+    return waitUntil([&] { return errorOutput().find(text) != std::string::npos; }, timeoutSeconds);
 }
 
-bool ServiceProcess::waitForError(const std::string& text, double timeoutSeconds) {
-    const auto deadline = deadlineAfter(timeoutSeconds);
-    for (;;) {
-        if (errorOutput().find(text) != std::string::npos) {
-            return true;
-        }
-        if (Clock::now() >= deadline) {
-            return false;
-        }
-        pause();
-    }
+bool BackgroundProcess::waitForOutput(const std::function<bool(const std::string&)>& holds,
+                                      double timeoutSeconds) {
+    return waitUntil([&] { return holds(standardOutput()); }, timeoutSeconds);
 }
 
-std::string ServiceProcess::errorOutput() const {
+std::string BackgroundProcess::errorOutput() const {
     return readWholeFile(errPath_);
 }
-std::string ServiceProcess::standardOutput() const {
+std::string BackgroundProcess::standardOutput() const {
     return readWholeFile(outPath_);
 }
 
-void ServiceProcess::sendSignal(int signal) {
+void BackgroundProcess::sendSignal(int signal) {
     if (pid_ > 0 && !exitCode_) {
         kill(pid_, signal);
     }
 }
 
-std::optional<int> ServiceProcess::waitForExit(double timeoutSeconds) {
+std::optional<int> BackgroundProcess::waitForExit(double timeoutSeconds) {
     if (exitCode_ || pid_ <= 0) {
         return exitCode_;
     }

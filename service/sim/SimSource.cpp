@@ -1,0 +1,95 @@
+#include "service/sim/SimSource.h"
+
+#include "core/platform/StringFormat.h"
+#include "core/platform/SystemLog.h"
+#include "service/sim/TechnologyEmitter.h"
+
+namespace velmar {
+
+namespace {
+
+// 1980-01-06 00:00:00 UTC, the baseband's epoch, in seconds since 1970-01-01.
+constexpr std::int64_t kBasebandEpochUnixSeconds = 315964800;
+
+const char* scenarioName(sim::Scenario scenario) {
+    switch (scenario) {
+        case sim::Scenario::Drive:
+            return "drive";
+        case sim::Scenario::Walk:
+            return "walk";
+        case sim::Scenario::Static:
+            break;
+    }
+    return "static";
+}
+
+}  // namespace
+
+SimSource::SimSource(Settings settings)
+    : settings_(std::move(settings)), alive_(std::make_shared<bool>(true)) {}
+
+SimSource::~SimSource() {
+    stop();
+}
+
+std::uint64_t SimSource::basebandTimestampOf(std::chrono::system_clock::time_point instant) {
+    const auto sinceUnixEpoch =
+        std::chrono::duration_cast<std::chrono::microseconds>(instant.time_since_epoch()).count();
+    const std::int64_t sinceBasebandEpoch = sinceUnixEpoch - kBasebandEpochUnixSeconds * 1000000;
+    if (sinceBasebandEpoch <= 0) {
+        return 0;
+    }
+    // 1/800 s units: microseconds × 800 / 1e6 = microseconds / 1250.
+    return (static_cast<std::uint64_t>(sinceBasebandEpoch) / 1250) << 16;
+}
+
+bool SimSource::prepare(std::string& error) {
+    sim::SimRandom probe(settings_.seed);
+    if (!sim::makeTechnologyEmitter(settings_.technology, probe)) {
+        error = "the simulated baseband cannot simulate " + settings_.technology + " in this build";
+        return false;
+    }
+    return true;
+}
+
+std::string SimSource::description() const {
+    return stringWithFormat("simulated %s baseband (%s, seed %llu, rate x%g)", settings_.technology.c_str(),
+                            scenarioName(settings_.scenario), static_cast<unsigned long long>(settings_.seed),
+                            settings_.rateMultiplier);
+}
+
+void SimSource::start(MainQueue& queue, BlobSink& sink) {
+    queue_ = &queue;
+    sink_ = &sink;
+    *alive_ = true;
+    sim::SimSettings settings;
+    settings.technology = settings_.technology;
+    settings.seed = settings_.seed;
+    settings.scenario = settings_.scenario;
+    settings.startTimestamp = basebandTimestampOf(std::chrono::system_clock::now());
+    baseband_ = std::make_unique<sim::SimulatedBaseband>(settings);
+    started_ = Clock::now();
+    pump();
+    timer_ = queue.repeating(kTickSeconds, [this, alive = std::weak_ptr<bool>(alive_)] {
+        const std::shared_ptr<bool> live = alive.lock();
+        if (live && *live) {
+            pump();
+        }
+    });
+}
+
+void SimSource::stop() {
+    *alive_ = false;
+    if (queue_ != nullptr && timer_ != 0) {
+        queue_->cancelTimer(timer_);
+    }
+    timer_ = 0;
+}
+
+void SimSource::pump() {
+    const double wall = std::chrono::duration<double>(Clock::now() - started_).count();
+    baseband_->runUntil(wall * settings_.rateMultiplier,
+                        [this](ByteView blob) { sink_->deliver(frameBasebandBlob(blob)); });
+}
+
+}  // namespace velmar

@@ -1,0 +1,220 @@
+// velmar --headless as a user runs it, against a real kxserverd: it connects and shows a tree that changes,
+// survives the service being killed and reconnects when it is back, lets a second monitor find its port
+// taken, redraws at most once per display tick, and ends cleanly on SIGTERM.
+#include <gtest/gtest.h>
+#include <signal.h>
+
+#include <chrono>
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "tests/support/BackgroundProcess.h"
+#include "tests/support/Json.h"
+#include "tests/support/TestPaths.h"
+#include "tests/ui/ChangingValues.h"
+#include "tests/ui/KxServerProcess.h"
+
+namespace velmar {
+namespace {
+
+// One JSON line of the headless monitor.
+struct HeadlessLine {
+    bool connected = false;
+    std::string status;
+    PlistValue tree;
+};
+
+std::vector<HeadlessLine> headlessLines(const std::string& output) {
+    std::vector<HeadlessLine> lines;
+    for (const std::string& text : testing::linesOf(output)) {
+        const auto parsed = testing::parseJson(text);
+        if (!parsed || !parsed->isDictionary()) {
+            ADD_FAILURE() << "not a JSON object: " << text;
+            continue;
+        }
+        const PlistDictionary& line = *parsed->dictionary();
+        HeadlessLine entry;
+        entry.connected = line.get("connected").booleanValue().value_or(false);
+        entry.status = line.get("status").isString() ? *line.get("status").string() : std::string("?");
+        entry.tree = line.get("tree");
+        lines.push_back(std::move(entry));
+    }
+    return lines;
+}
+
+std::size_t connectedLines(const std::string& output) {
+    std::size_t count = 0;
+    for (const HeadlessLine& line : headlessLines(output)) {
+        count += line.connected ? 1 : 0;
+    }
+    return count;
+}
+
+std::size_t occurrences(const std::string& text, const std::string& what) {
+    std::size_t count = 0;
+    for (std::size_t at = text.find(what); at != std::string::npos; at = text.find(what, at + 1)) {
+        ++count;
+    }
+    return count;
+}
+
+class HeadlessEndToEndTest : public ::testing::Test {
+  protected:
+    std::vector<std::string> environment() const {
+        return {"VELMAR_RUNTIME_DIR=" + runtime_.path(),
+                "XDG_CONFIG_HOME=" + config_.path(),
+                "XDG_STATE_HOME=" + state_.path(),
+                "DISPLAY=",
+                "WAYLAND_DISPLAY=",
+                "QT_QPA_PLATFORM="};
+    }
+    std::unique_ptr<testing::BackgroundProcess> startMonitor(const std::string& directory) const {
+        return std::make_unique<testing::BackgroundProcess>(
+            VELMAR_PATH, std::vector<std::string>{"--headless", "--log-stderr"}, directory, environment());
+    }
+
+    testing::TemporaryDirectory runtime_;
+    testing::TemporaryDirectory config_;
+    testing::TemporaryDirectory state_;
+    testing::TemporaryDirectory outputs_;
+};
+
+TEST_F(HeadlessEndToEndTest, ConnectsAndShowsATreeThatChanges) {
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    auto monitor = startMonitor(outputs_.path());
+
+    ASSERT_TRUE(monitor->waitForOutput([](const std::string& out) { return connectedLines(out) >= 5; }, 30))
+        << monitor->standardOutput() << monitor->errorOutput();
+    const std::vector<HeadlessLine> lines = headlessLines(monitor->standardOutput());
+    // The launch line comes before the first connection.
+    EXPECT_FALSE(lines.front().connected);
+    EXPECT_EQ(lines.front().status, "Connecting");  // the root pane's own launch status, without dots
+    std::vector<testing::LeafValues> snapshots;
+    for (const HeadlessLine& line : lines) {
+        if (line.connected) {
+            ASSERT_TRUE(line.tree.isDictionary());
+            EXPECT_EQ(line.status.rfind("Updated ", 0), 0u) << line.status;
+            snapshots.push_back(testing::leavesOfJson(line.tree));
+        }
+    }
+    EXPECT_FALSE(snapshots.back().empty());
+    EXPECT_NE(testing::busiestPane(snapshots), "")
+        << "no value changed over " << snapshots.size() << " redraws";
+    EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** Created ports (send="), 1u)
+        << monitor->errorOutput();
+    EXPECT_NE(monitor->errorOutput().find("Got log generated: 0x"), std::string::npos);
+}
+
+TEST_F(HeadlessEndToEndTest, SurvivesTheServiceBeingKilledAndReconnectsWhenItIsBack) {
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    auto monitor = startMonitor(outputs_.path());
+    ASSERT_TRUE(monitor->waitForOutput([](const std::string& out) { return connectedLines(out) >= 2; }, 30))
+        << monitor->errorOutput();
+
+    service.kill();
+    ASSERT_TRUE(monitor->waitForError(" ***** INVALIDATED 0x", 10)) << monitor->errorOutput();
+    EXPECT_FALSE(monitor->waitForExit(1).has_value()) << "the monitor ended with the service";
+    const std::size_t linesBefore = testing::linesOf(monitor->standardOutput()).size();
+
+    ASSERT_TRUE(service.start()) << service.description();
+    // Reconnected within one retry period (5 s) and a display tick, and showing data again.
+    ASSERT_TRUE(monitor->waitForOutput(
+        [&](const std::string& out) {
+            const std::vector<HeadlessLine> lines = headlessLines(out);
+            return lines.size() > linesBefore && lines.back().connected;
+        },
+        15))
+        << monitor->errorOutput();
+    EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** INVALIDATED 0x"), 1u);
+    EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** Created ports (send="), 2u)
+        << monitor->errorOutput();
+    const std::vector<HeadlessLine> lines = headlessLines(monitor->standardOutput());
+    EXPECT_TRUE(lines.back().tree.isDictionary());
+    // The generator of the first connection was destroyed at the restart: its class index's own lines went
+    // to standard error (--log-stderr), not into the JSON lines.
+    EXPECT_NE(monitor->errorOutput().find("Deallocing LTEClassIndex\nDeallocing ClassIndex\n"),
+              std::string::npos);
+}
+
+TEST_F(HeadlessEndToEndTest, ASecondMonitorFindsItsPortTakenAndKeepsTrying) {
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    auto first = startMonitor(outputs_.path());
+    ASSERT_TRUE(first->waitForOutput([](const std::string& out) { return connectedLines(out) >= 1; }, 30));
+
+    testing::TemporaryDirectory secondOutputs;
+    auto second = startMonitor(secondOutputs.path());
+    ASSERT_TRUE(second->waitForError("Local messsage port already exists", 10)) << second->errorOutput();
+    EXPECT_FALSE(second->waitForExit(1).has_value()) << "the second monitor gave up";
+    EXPECT_EQ(second->errorOutput().find(" ***** Created ports"), std::string::npos);
+    // The first one is not disturbed: it keeps redrawing with data.
+    const std::size_t firstConnected = connectedLines(first->standardOutput());
+    EXPECT_TRUE(first->waitForOutput(
+        [&](const std::string& out) { return connectedLines(out) >= firstConnected + 2; }, 15));
+    EXPECT_EQ(first->errorOutput().find("INVALIDATED"), std::string::npos) << first->errorOutput();
+}
+
+TEST_F(HeadlessEndToEndTest, RedrawsAtMostOncePerDisplayTickUnderAFastStream) {
+    // Twenty times the baseband's rates: many blobs per tick, still one redraw per tick at most.
+    testing::KxServerProcess service(runtime_.path(), "lte", {"--rate-multiplier", "20"});
+    ASSERT_TRUE(service.start()) << service.description();
+    auto monitor = startMonitor(outputs_.path());
+    ASSERT_TRUE(monitor->waitForOutput([](const std::string& out) { return connectedLines(out) >= 1; }, 30));
+    const auto started = std::chrono::steady_clock::now();
+    const std::size_t before = testing::linesOf(monitor->standardOutput()).size();
+    std::this_thread::sleep_for(std::chrono::seconds(9));
+    const std::size_t after = testing::linesOf(monitor->standardOutput()).size();
+    const double seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - started).count();
+    // The display timer ticks every 2 s; one line per redraw.
+    EXPECT_LE(after - before, static_cast<std::size_t>(seconds / 2.0) + 1);
+    EXPECT_GE(after - before, 3u) << "the monitor stopped redrawing";
+}
+
+TEST_F(HeadlessEndToEndTest, SigtermEndsTheMonitorWithStatusZero) {
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    auto monitor = startMonitor(outputs_.path());
+    ASSERT_TRUE(monitor->waitForOutput([](const std::string& out) { return connectedLines(out) >= 1; }, 30));
+    monitor->sendSignal(SIGTERM);
+    const auto status = monitor->waitForExit(10);
+    ASSERT_TRUE(status.has_value());
+    EXPECT_EQ(*status, 0);
+}
+
+// Every technology of the simulated baseband reaches the screen as a connected tree whose values change.
+class HeadlessTechnologyTest : public HeadlessEndToEndTest,
+                               public ::testing::WithParamInterface<const char*> {};
+
+TEST_P(HeadlessTechnologyTest, TheSimulatedBasebandShowsALivingTree) {
+    testing::KxServerProcess service(runtime_.path(), GetParam(), {"--rate-multiplier", "4"});
+    ASSERT_TRUE(service.start()) << service.description();
+    auto monitor = startMonitor(outputs_.path());
+    std::vector<testing::LeafValues> snapshots;
+    const bool changed = monitor->waitForOutput(
+        [&](const std::string& out) {
+            snapshots.clear();
+            for (const HeadlessLine& line : headlessLines(out)) {
+                if (line.connected && line.tree.isDictionary()) {
+                    snapshots.push_back(testing::leavesOfJson(line.tree));
+                }
+            }
+            return snapshots.size() >= 2 && !testing::busiestPane(snapshots).empty();
+        },
+        40);
+    ASSERT_TRUE(changed) << snapshots.size() << " connected redraws\n" << monitor->errorOutput();
+    EXPECT_GE(snapshots.back().size(), 5u) << "only " << snapshots.back().size() << " values shown";
+}
+
+INSTANTIATE_TEST_SUITE_P(EveryTechnology, HeadlessTechnologyTest,
+                         ::testing::Values("gsm", "lte", "utran", "cdma", "ifx"),
+                         [](const ::testing::TestParamInfo<const char*>& info) {
+                             return std::string(info.param);
+                         });
+
+}  // namespace
+}  // namespace velmar

@@ -1,0 +1,369 @@
+// The terminal interface as a user sees it: `velmar --terminal` in a tmux session of 80 x 24 (send-keys,
+// capture-pane), against a real kxserverd. Captured screens are kept under <build>/screenshots.
+#ifdef VELMAR_WITH_TERMINAL
+
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <thread>
+
+#include "core/platform/plist/PlistCodec.h"
+#include "tests/support/Json.h"
+#include "tests/support/Process.h"
+#include "tests/support/TestPaths.h"
+#include "tests/ui/ChangingValues.h"
+#include "tests/ui/KxServerProcess.h"
+
+namespace velmar {
+namespace {
+
+constexpr const char* kTmux = "/usr/bin/tmux";
+constexpr int kColumns = 80;
+constexpr int kRows = 24;
+
+std::vector<std::string> splitLines(const std::string& text) {
+    std::vector<std::string> lines;
+    std::istringstream stream(text);
+    std::string line;
+    while (std::getline(stream, line)) {
+        lines.push_back(line);
+    }
+    return lines;
+}
+
+bool startsWith(const std::string& text, const std::string& prefix) {
+    return text.rfind(prefix, 0) == 0;
+}
+
+// One tmux server of our own (its own socket), with one session running the monitor.
+class TmuxSession {
+  public:
+    TmuxSession() : socket_("velmar-ui-" + std::to_string(getpid()) + "-" + std::to_string(counter()++)) {}
+    ~TmuxSession() { tmux({"kill-server"}); }
+
+    bool start(const std::vector<std::string>& environment, const std::vector<std::string>& command) {
+        std::vector<std::string> arguments = {
+            "new-session",         "-d",          "-s", "velmar", "-x", std::to_string(kColumns), "-y",
+            std::to_string(kRows), "/usr/bin/env"};
+        arguments.insert(arguments.end(), environment.begin(), environment.end());
+        arguments.insert(arguments.end(), command.begin(), command.end());
+        return tmux(arguments).exitCode == 0;
+    }
+    std::vector<std::string> screen() { return splitLines(tmux({"capture-pane", "-p", "-t", "velmar"}).out); }
+    // The screen with its attributes as escape sequences (reverse video is ESC[7m).
+    std::string screenWithAttributes() { return tmux({"capture-pane", "-p", "-e", "-t", "velmar"}).out; }
+    void keys(const std::vector<std::string>& names) {
+        std::vector<std::string> arguments = {"send-keys", "-t", "velmar"};
+        arguments.insert(arguments.end(), names.begin(), names.end());
+        tmux(arguments);
+    }
+    void resize(int columns, int rows) {
+        tmux({"resize-window", "-t", "velmar", "-x", std::to_string(columns), "-y", std::to_string(rows)});
+    }
+    bool alive() { return tmux({"has-session", "-t", "velmar"}).exitCode == 0; }
+
+    // Waits until the screen satisfies predicate; answers the last screen seen.
+    bool waitFor(const std::function<bool(const std::vector<std::string>&)>& predicate, double seconds,
+                 std::vector<std::string>* last = nullptr) {
+        const auto deadline = std::chrono::steady_clock::now() + std::chrono::duration<double>(seconds);
+        for (;;) {
+            std::vector<std::string> lines = screen();
+            const bool done = predicate(lines);
+            if (last != nullptr) {
+                *last = lines;
+            }
+            if (done) {
+                return true;
+            }
+            if (std::chrono::steady_clock::now() >= deadline) {
+                return false;
+            }
+            std::this_thread::sleep_for(std::chrono::milliseconds(100));
+        }
+    }
+
+  private:
+    static int& counter() {
+        static int value = 0;
+        return value;
+    }
+    testing::ProcessResult tmux(std::vector<std::string> arguments) {
+        arguments.insert(arguments.begin(), {kTmux, "-u", "-f", "/dev/null", "-L", socket_});
+        return testing::runProcess(arguments);
+    }
+    std::string socket_;
+};
+
+std::string footer(const std::vector<std::string>& lines) {
+    return lines.size() >= kRows ? lines[kRows - 1] : "";
+}
+
+// The lines between the title and the footer.
+std::vector<std::string> body(const std::vector<std::string>& lines) {
+    if (lines.size() < kRows) {
+        return {};
+    }
+    return std::vector<std::string>(lines.begin() + 1, lines.begin() + kRows - 1);
+}
+
+void keepScreen(const std::string& name, const std::vector<std::string>& lines) {
+    const std::string directory = std::string(VELMAR_BINARY_DIR) + "/screenshots";
+    std::filesystem::create_directories(directory);
+    std::ofstream out(directory + "/" + name);
+    for (const std::string& line : lines) {
+        out << line << "\n";
+    }
+}
+
+class TerminalTmuxTest : public ::testing::Test {
+  protected:
+    void SetUp() override {
+        if (access(kTmux, X_OK) != 0) {
+            GTEST_SKIP() << "tmux is not installed";
+        }
+    }
+    std::vector<std::string> environment() const {
+        return {"VELMAR_RUNTIME_DIR=" + runtime_.path(),
+                "XDG_CONFIG_HOME=" + config_.path(),
+                "XDG_STATE_HOME=" + state_.path(),
+                "VELMAR_SYSROOT=" + sysroot_.path(),
+                "VELMAR_RESOURCE_DIR=" + std::string(VELMAR_SOURCE_DIR) + "/resources/templates",
+                "LANG=C.UTF-8",
+                "LC_ALL=C.UTF-8",
+                "TZ=UTC",
+                "TERM=screen",
+                "DISPLAY=",
+                "WAYLAND_DISPLAY="};
+    }
+    void allowSaving() {
+        std::filesystem::create_directories(
+            sysroot_.path() + "/BrindleInternal/Library/PreferenceBundles/Carrier Settings.bundle");
+    }
+    // Opens the panes of path from the root, by the rows' names on screen.
+    bool openPath(TmuxSession& session, const std::string& path) {
+        for (int i = 0; i < 8; ++i) {
+            session.keys({"Escape"});
+        }
+        if (!session.waitFor(
+                [](const auto& lines) { return !lines.empty() && startsWith(lines[0], " Velmar "); }, 3)) {
+            return false;
+        }
+        session.keys({"Home"});
+        std::string current = "/";
+        for (const std::string& name : testing::pathComponents(path)) {
+            std::vector<std::string> lines;
+            int row = -1;
+            session.waitFor(
+                [&](const auto& shown) {
+                    for (std::size_t i = 1; i + 1 < shown.size(); ++i) {
+                        if (startsWith(shown[i], " " + name + " ") || shown[i] == " " + name) {
+                            row = static_cast<int>(i) - 1;
+                            return true;
+                        }
+                    }
+                    return false;
+                },
+                3, &lines);
+            if (row < 0) {
+                return false;
+            }
+            std::vector<std::string> keys(static_cast<std::size_t>(row), "Down");
+            keys.push_back("Enter");
+            session.keys(keys);
+            current = current == "/" ? "/" + name : current + "/" + name;
+            const std::string expected = current;
+            if (!session.waitFor(
+                    [&](const auto& shown) {
+                        return !shown.empty() && shown[0].find(expected.substr(expected.rfind('/') + 1)) == 1;
+                    },
+                    3)) {
+                return false;
+            }
+        }
+        return true;
+    }
+    // The busiest pane of the live service, found through the headless monitor.
+    std::string busiestPane() {
+        const auto result = testing::runProcess(
+            {"/usr/bin/timeout", "-s", "TERM", "14", VELMAR_PATH, "--headless"}, "", environment());
+        std::vector<testing::LeafValues> snapshots;
+        for (const std::string& line : splitLines(result.out)) {
+            const auto json = testing::parseJson(line);
+            if (json && json->dictionary() &&
+                json->dictionary()->get("connected") == PlistValue::boolean(true)) {
+                snapshots.push_back(testing::leavesOfJson(json->dictionary()->get("tree")));
+            }
+        }
+        return testing::busiestPane(snapshots);
+    }
+
+    testing::TemporaryDirectory runtime_;
+    testing::TemporaryDirectory config_;
+    testing::TemporaryDirectory state_;
+    testing::TemporaryDirectory sysroot_;
+};
+
+TEST_F(TerminalTmuxTest, ConnectsShowsChangingValuesSurvivesTheServiceDyingAndReconnects) {
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    std::cout << "service: " << service.description() << std::endl;
+    const std::string pane = busiestPane();
+    ASSERT_FALSE(pane.empty()) << "no value changed on the live service";
+
+    TmuxSession session;
+    const auto started = std::chrono::steady_clock::now();
+    ASSERT_TRUE(session.start(environment(), {VELMAR_PATH, "--terminal"}));
+    std::vector<std::string> lines;
+    ASSERT_TRUE(session.waitFor([](const auto& shown) { return startsWith(footer(shown), "   Updated "); }, 5,
+                                &lines))
+        << footer(lines);
+    EXPECT_LT(std::chrono::steady_clock::now() - started, std::chrono::seconds(5));
+    EXPECT_EQ(lines[0].substr(0, 8), " Velmar ");
+    keepScreen("terminal-root.txt", lines);
+
+    ASSERT_TRUE(openPath(session, pane)) << pane;
+    bool changed = false;
+    for (int i = 0; i < 8 && !changed; ++i) {
+        const std::vector<std::string> before = session.screen();
+        ASSERT_TRUE(session.waitFor(
+            [&](const auto& shown) {
+                return footer(shown) != footer(before) && startsWith(footer(shown), "   Updated ");
+            },
+            15, &lines));
+        if (lines[0] != before[0]) {
+            ASSERT_TRUE(openPath(session, pane)) << pane << " came back";
+            continue;
+        }
+        changed = body(lines) != body(before);
+    }
+    EXPECT_TRUE(changed) << "the values of " << pane << " did not change on screen";
+    keepScreen("terminal-live-pane.txt", lines);
+
+    // The service dies: the values stay; a pane change shows "Connecting..." and the spinner turns.
+    const std::vector<std::string> kept = body(session.screen());
+    service.kill();
+    std::this_thread::sleep_for(std::chrono::milliseconds(1500));
+    EXPECT_EQ(body(session.screen()), kept);
+    session.keys({"Escape"});
+    ASSERT_TRUE(session.waitFor([](const auto& shown) { return footer(shown).find("Connecting...") == 5; }, 3,
+                                &lines))
+        << footer(lines);
+    const std::string spinner = footer(lines).substr(0, 4);
+    EXPECT_NE(spinner, "    ");
+    EXPECT_TRUE(session.waitFor([&](const auto& shown) { return footer(shown).substr(0, 4) != spinner; }, 2));
+    session.keys({"Enter"});
+    ASSERT_TRUE(session.waitFor([](const auto& shown) { return footer(shown).find("Connecting...") == 5; }, 3,
+                                &lines));
+    EXPECT_EQ(body(lines), kept);
+    keepScreen("terminal-service-gone.txt", lines);
+
+    // Back again: connected within a retry and a tick; the values were there all along.
+    ASSERT_TRUE(service.start());
+    ASSERT_TRUE(session.waitFor([](const auto& shown) { return startsWith(footer(shown), "   Updated "); },
+                                12, &lines))
+        << footer(lines);
+    keepScreen("terminal-reconnected.txt", lines);
+    session.keys({"q"});
+    EXPECT_TRUE(session.waitFor([&](const auto&) { return !session.alive(); }, 5));
+}
+
+TEST_F(TerminalTmuxTest, ScreenLayoutKeysResizeSaveAndQuit) {
+    allowSaving();
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    TmuxSession session;
+    ASSERT_TRUE(session.start(environment(), {VELMAR_PATH, "--terminal"}));
+    std::vector<std::string> lines;
+    ASSERT_TRUE(session.waitFor([](const auto& shown) { return startsWith(footer(shown), "   Updated "); }, 5,
+                                &lines));
+    ASSERT_EQ(lines.size(), static_cast<std::size_t>(kRows));
+    EXPECT_EQ(lines[0], " Velmar" + std::string(71, ' ') + "/");
+    EXPECT_EQ(lines[1].substr(lines[1].size() - 3), "›");  // an inner node; its mark is 3 bytes of UTF-8
+    EXPECT_EQ(footer(lines).substr(footer(lines).size() - 18), "[s] Save  [q] Quit");
+    // The cursor row is in reverse video.
+    EXPECT_NE(session.screenWithAttributes().find("\x1b[7m"), std::string::npos);
+
+    // A smaller terminal is redrawn at its size.
+    session.resize(60, 20);
+    ASSERT_TRUE(session.waitFor([](const auto& shown) { return shown.size() == 20 && shown[0].size() == 59; },
+                                3, &lines))
+        << (lines.empty() ? "" : lines[0]);
+    EXPECT_EQ(lines[0], " Velmar" + std::string(51, ' ') + "/");
+    keepScreen("terminal-60x20.txt", lines);
+    session.resize(kColumns, kRows);
+    ASSERT_TRUE(session.waitFor(
+        [](const auto& shown) { return shown.size() == kRows && shown[0].size() == kColumns - 1; }, 3));
+
+    // s opens the save form; typing, Return, then Enter on Save writes the snapshot and closes the form.
+    session.keys({"s"});
+    ASSERT_TRUE(session.waitFor(
+        [](const auto& shown) {
+            for (const auto& line : shown) {
+                if (line.find("Save Snapshot") != std::string::npos) {
+                    return true;
+                }
+            }
+            return false;
+        },
+        3, &lines));
+    keepScreen("terminal-save-form.txt", lines);
+    session.keys({"-l", "Cell edge, tunnel"});
+    session.keys({"Enter"});
+    session.keys({"Enter"});
+    ASSERT_TRUE(session.waitFor(
+        [](const auto& shown) {
+            for (const auto& line : shown) {
+                if (line.find("Save Snapshot") != std::string::npos) {
+                    return false;
+                }
+            }
+            return true;
+        },
+        3, &lines));
+    std::vector<std::string> snapshots;
+    for (const auto& entry : std::filesystem::directory_iterator(state_.path() + "/velmar/diagnostics")) {
+        snapshots.push_back(entry.path().string());
+    }
+    ASSERT_EQ(snapshots.size(), 1u);
+    const auto saved = readDictionaryFile(snapshots[0]);
+    ASSERT_TRUE(saved);
+    EXPECT_EQ(*saved->dictionary()->get("Description").string(), "Cell edge, tunnel");
+    ASSERT_TRUE(saved->dictionary()->get("Data").array());
+
+    // q quits and the termination sequence resets the home screen's preference.
+    session.keys({"q"});
+    ASSERT_TRUE(session.waitFor([&](const auto&) { return !session.alive(); }, 5));
+    const auto preferences =
+        readDictionaryFile(config_.path() + "/velmar/preferences/com.velmar.homescreen.plist");
+    ASSERT_TRUE(preferences);
+    EXPECT_EQ(preferences->dictionary()->get("HxShowGSMRSSI"), PlistValue::boolean(false));
+}
+
+TEST_F(TerminalTmuxTest, WithoutTheMarkerTheFooterOffersNoSaveAndSDoesNothing) {
+    TmuxSession session;
+    ASSERT_TRUE(session.start(environment(), {VELMAR_PATH, "--terminal"}));
+    std::vector<std::string> lines;
+    // No service at all: the root pane says "Connecting" and the spinner turns.
+    ASSERT_TRUE(
+        session.waitFor([](const auto& shown) { return footer(shown).find("Connecting") == 5; }, 5, &lines));
+    EXPECT_EQ(footer(lines).substr(footer(lines).size() - 8), "[q] Quit");
+    EXPECT_EQ(footer(lines).find("[s] Save"), std::string::npos);
+    keepScreen("terminal-connecting.txt", lines);
+    session.keys({"s"});
+    std::this_thread::sleep_for(std::chrono::milliseconds(300));
+    for (const auto& line : session.screen()) {
+        EXPECT_EQ(line.find("Save Snapshot"), std::string::npos);
+    }
+    session.keys({"q"});
+    EXPECT_TRUE(session.waitFor([&](const auto&) { return !session.alive(); }, 5));
+}
+
+}  // namespace
+}  // namespace velmar
+
+#endif  // VELMAR_WITH_TERMINAL
