@@ -8,6 +8,7 @@
 // timers as members and poll them, which keeps the emission order a pure function of the snapshots.
 #pragma once
 
+#include <array>
 #include <cmath>
 #include <cstdint>
 #include <limits>
@@ -69,5 +70,25 @@ class TickTimer {
     Tick period_;
     Tick next_ = kNever;
 };
+
+// Fires, earliest first, every timer of timers that is due by now (a timer falling due several times fires
+// each time; on equal ticks the lower index goes first), calling fire(index, tickItWasDueAt).
+template <std::size_t Count, typename Fire>
+void fireDueTimers(std::array<TickTimer, Count>& timers, Tick now, Fire&& fire) {
+    for (;;) {
+        std::size_t due = Count;
+        Tick dueTick = kNever;
+        for (std::size_t i = 0; i < Count; ++i) {
+            if (timers[i].next() < dueTick) {
+                dueTick = timers[i].next();
+                due = i;
+            }
+        }
+        if (due == Count || dueTick > now) {
+            return;
+        }
+        fire(due, timers[due].fire());
+    }
+}
 
 }  // namespace velmar::sim

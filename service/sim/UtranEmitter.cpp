@@ -94,20 +94,8 @@ void UtranEmitter::step(const RadioSnapshot& snapshot, const BlobOutput& emit) {
         timers_[kSimFiles].armAt(now);
     }
     levelsFresh_ = false;
-    for (;;) {
-        std::size_t due = kTimerCount;
-        Tick dueTick = kNever;
-        for (std::size_t i = 0; i < kTimerCount; ++i) {
-            if (timers_[i].next() < dueTick) {
-                dueTick = timers_[i].next();
-                due = i;
-            }
-        }
-        if (due == kTimerCount || dueTick > now) {
-            break;
-        }
-        fire(static_cast<Timer>(due), timers_[due].fire(), snapshot, emit);
-    }
+    fireDueTimers(timers_, now,
+                  [&](std::size_t due, Tick at) { fire(static_cast<Timer>(due), at, snapshot, emit); });
 
     const std::uint64_t timestamp = clock_.timestamp(now);
     if (snapshot.servingCell != lastServing_) {

@@ -7,6 +7,7 @@
 #include <QApplication>
 #include <QDir>
 #include <QFontMetrics>
+#include <QLabel>
 #include <QMessageBox>
 #include <QPushButton>
 #include <QScrollBar>
@@ -52,7 +53,7 @@ class GuiGenerator : public MonitorGenerator {
         serving->set("E-ARFCN", "6300");
         serving->set("Band", kLongBand);
         auto display = PlistDictionary::create();
-        display->set("Serving Cell", serving);
+        display->set(servingName, serving);
         if (withNeighbours) {
             auto neighbours = PlistArray::create();
             for (int i = 0; i < neighbourCount; ++i) {
@@ -82,6 +83,7 @@ class GuiGenerator : public MonitorGenerator {
         return entries;
     }
     int pci = 101;
+    std::string servingName = "Serving Cell";
     bool withNeighbours = true;
     int neighbourCount = 3;
     int blobs = 0;
@@ -247,6 +249,25 @@ TEST_F(QtGuiTest, TappingAnInnerRowPushesAPaneAtTheJoinedPathWithTheStatus) {
     EXPECT_TRUE(navigation().isAnimating());
     waitForAnimations();
     EXPECT_EQ(top().path(), "/Neighbours");
+}
+
+TEST_F(QtGuiTest, ALongTitleIsCutAtItsEndAndNeverRunsUnderTheBackButton) {
+    testing::FakeTelephonyService service;
+    launch();
+    connectAndRedraw(service);
+    const QString longName = "Connected mode LTE Intra-frequency Measurement";
+    generator_->servingName = longName.toStdString();
+    deliverAndRedraw(service);
+    tap(cell(top(), 0));
+    waitForAnimations();
+    ASSERT_EQ(top().title(), longName);
+    QLabel* title = navigation().titleLabel();
+    EXPECT_TRUE(title->text().endsWith(QChar(0x2026))) << title->text().toStdString();
+    EXPECT_TRUE(longName.startsWith(title->text().chopped(1))) << title->text().toStdString();
+    EXPECT_LE(QFontMetrics(title->font()).horizontalAdvance(title->text()), title->width());
+    EXPECT_GE(title->geometry().left(), navigation().backButton()->geometry().right());
+    EXPECT_EQ(title->toolTip(), longName);
+    app_->window()->grab().save(QString::fromStdString(screenshotPath("gui-long-title.png")));
 }
 
 TEST_F(QtGuiTest, TappingALeafOnlyDeselectsIt) {

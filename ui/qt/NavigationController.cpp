@@ -20,7 +20,7 @@ constexpr int kBackButtonMinWidth = 80;
 constexpr int kBackButtonMaxWidth = 220;
 
 // The title bar: a back button on the left and the title centred over the whole width. The back button names
-// the pane below, cut to the room the title leaves it.
+// the pane below, cut to the room the title leaves it; a title too long for what is left is cut at its end.
 class TitleBar : public QWidget {
   public:
     TitleBar(QWidget* parent, QToolButton*& back, QLabel*& title) : QWidget(parent) {
@@ -43,14 +43,16 @@ class TitleBar : public QWidget {
         back_->setVisible(false);
     }
 
-    void setBackTitle(const QString& text) {
-        backTitle_ = text;
+    void setTitles(const QString& title, const QString& backTitle) {
+        title_->setToolTip(title);
+        fullTitle_ = title;
+        backTitle_ = backTitle;
         relayout();
     }
 
     void relayout() {
         const QFontMetrics titleMetrics(title_->font());
-        const int titleWidth = std::min(width(), titleMetrics.horizontalAdvance(title_->text()));
+        const int titleWidth = std::min(width(), titleMetrics.horizontalAdvance(fullTitle_));
         // Whatever the centred title leaves on its left, within reason.
         const int room =
             std::clamp((width() - titleWidth) / 2 - 12, kBackButtonMinWidth, kBackButtonMaxWidth);
@@ -63,7 +65,13 @@ class TitleBar : public QWidget {
         const QSize backSize = back_->sizeHint().boundedTo(QSize(room, height()));
         back_->setGeometry(4, (height() - backSize.height()) / 2, backSize.width(), backSize.height());
         const int reserved = back_->isVisible() ? backSize.width() + 8 : 8;
-        title_->setGeometry(reserved, 0, std::max(0, width() - 2 * reserved), height());
+        const int titleRoom = std::max(0, width() - 2 * reserved);
+        title_->setGeometry(reserved, 0, titleRoom, height());
+        // A title longer than its room is cut at the end, never drawn under the back button.
+        const QString shown = titleMetrics.elidedText(fullTitle_, Qt::ElideRight, titleRoom);
+        if (title_->text() != shown) {
+            title_->setText(shown);
+        }
     }
 
   protected:
@@ -77,6 +85,7 @@ class TitleBar : public QWidget {
   private:
     QToolButton* back_;
     QLabel* title_;
+    QString fullTitle_;
     QString backTitle_;
 };
 
@@ -248,13 +257,10 @@ void NavigationController::paneTitleChanged(VelmarPaneController* pane) {
 
 void NavigationController::updateTitleBar() {
     VelmarPaneController* top = topPane();
-    const QString title = top ? top->title() : QString();
-    if (title_->text() != title) {
-        title_->setText(title);
-    }
     const bool canGoBack = panes_.size() > 1;
     back_->setVisible(canGoBack);
-    static_cast<TitleBar*>(bar_)->setBackTitle(canGoBack ? panes_[panes_.size() - 2]->title() : QString());
+    static_cast<TitleBar*>(bar_)->setTitles(top ? top->title() : QString(),
+                                            canGoBack ? panes_[panes_.size() - 2]->title() : QString());
 }
 
 bool NavigationController::eventFilter(QObject* watched, QEvent* event) {
