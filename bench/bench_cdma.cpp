@@ -13,6 +13,7 @@
 
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 #include "LogGenerator/StateKeys.h"
+#include "bench/BenchFeeding.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/records/CdmaRecords.h"
@@ -21,12 +22,6 @@ namespace velmar {
 namespace {
 
 constexpr std::size_t kRefreshEvery = 100;
-
-// The default threshold (error); lines that pass it go to a sink that drops them instead of syslog(3).
-void quietLog() {
-    SystemLog::setSink([](int, const std::string&) {});
-    SystemLog::setThreshold(kLogError);
-}
 
 class StreamMaker {
   public:
@@ -195,7 +190,7 @@ PlistValue shippedTemplate() {
 
 // Empty blobs stand for display refreshes; otherwise a refresh every refreshEvery blobs (0: never).
 void feed(benchmark::State& state, const std::vector<PlistData>& blobs, std::size_t refreshEvery) {
-    quietLog();
+    bench::quietLog();
     C2KLogGenerator generator;
     const StateDict stateDict = PlistDictionary::create();
     stateDict->set(state_keys::kTemplate, shippedTemplate());

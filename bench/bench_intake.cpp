@@ -7,6 +7,7 @@
 
 #include "LogGenerator/ClassIndex.h"
 #include "LogGenerator/ORVLogGenerator2.h"
+#include "bench/BenchFeeding.h"
 #include "core/ArrayLock.h"
 #include "core/VelmarModelNode.h"
 #include "core/platform/SystemLog.h"
@@ -16,21 +17,23 @@ namespace velmar {
 namespace {
 
 class CountingDecoder : public Base {
-public:
+  public:
     void updateWithData(ByteView data, std::int32_t) override { bytesSeen += data.size(); }
     std::string_view getSectionName() const override { return "Counter"; }
-    LogCodeArray getLogCodeArray() const override { return std::vector<std::int32_t>{0xB0C2, 0xB179, 0x7130}; }
+    LogCodeArray getLogCodeArray() const override {
+        return std::vector<std::int32_t>{0xB0C2, 0xB179, 0x7130};
+    }
     std::size_t bytesSeen = 0;
 };
 
 class CountingIndex : public ClassIndex {
-public:
+  public:
     CountingIndex() { decoder = Base::initWithDict<CountingDecoder>(classDict, codeDictionary); }
     std::shared_ptr<CountingDecoder> decoder;
 };
 
 class BenchGenerator : public ORVLogGenerator2 {
-public:
+  public:
     BenchGenerator() : ORVLogGenerator2("NoTemplate", std::make_shared<CountingIndex>()) {}
 };
 
@@ -49,14 +52,9 @@ const std::vector<PlistData>& captureBlobs() {
     return blobs;
 }
 
-void quietLog() {
-    SystemLog::setSink([](int, const std::string&) {});
-    SystemLog::setThreshold(kLogError);
-}
-
 // Framing and dispatch alone: what runs per packet before any decoder.
 void BM_FramingAndDispatch(benchmark::State& state) {
-    quietLog();
+    bench::quietLog();
     BenchGenerator generator;
     const auto& blobs = captureBlobs();
     std::size_t next = 0;
@@ -71,7 +69,7 @@ BENCHMARK(BM_FramingAndDispatch);
 // The whole intake of one blob as the model calls it (display lookup, dispatch, raw-data append), with a
 // display refresh every 1,000 blobs so the raw buffer stays the size of a real two-second interval.
 void BM_UpdateState(benchmark::State& state) {
-    quietLog();
+    bench::quietLog();
     BenchGenerator generator;
     const StateDict stateDict = PlistDictionary::create();
     const auto& blobs = captureBlobs();

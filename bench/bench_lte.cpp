@@ -11,8 +11,8 @@
 #include <vector>
 
 #include "LogGenerator/LTE/LTELogGenerator.h"
+#include "bench/BenchFeeding.h"
 #include "core/platform/KxServerProtocol.h"
-#include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/records/LteRecords.h"
 #include "logfile/records/RecordBuilder.h"
@@ -21,13 +21,6 @@ namespace velmar {
 namespace {
 
 constexpr std::size_t kRefreshEvery = 100;
-
-// The default threshold (error); lines that pass it go to a sink that drops them instead of syslog(3), so
-// that the figures measure decoding rather than the system journal.
-void quietLog() {
-    SystemLog::setSink([](int, const std::string&) {});
-    SystemLog::setThreshold(kLogError);
-}
 
 class StreamMaker {
   public:
@@ -203,23 +196,8 @@ const std::vector<PlistData>& lteStream() {
 }
 
 void feed(benchmark::State& state, const std::vector<PlistData>& blobs) {
-    quietLog();
     LTELogGenerator generator;
-    const StateDict stateDict = PlistDictionary::create();
-    std::size_t next = 0;
-    std::size_t sinceRefresh = 0;
-    std::size_t bytes = 0;
-    for (auto _ : state) {
-        generator.updateState(stateDict, blobs[next]);
-        bytes += blobs[next].size();
-        next = next + 1 == blobs.size() ? 0 : next + 1;
-        if (++sinceRefresh == kRefreshEvery) {
-            sinceRefresh = 0;
-            generator.generateLogUsingState(stateDict);
-        }
-    }
-    state.SetItemsProcessed(state.iterations());
-    state.SetBytesProcessed(static_cast<std::int64_t>(bytes));
+    bench::feedCycle(state, generator, blobs, kRefreshEvery);
 }
 
 void BM_LteStream(benchmark::State& state) {

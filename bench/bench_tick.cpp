@@ -8,6 +8,7 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/StateKeys.h"
+#include "bench/BenchFeeding.h"
 #include "core/ArrayLock.h"
 #include "core/VelmarModelNode.h"
 #include "core/platform/KxServerProtocol.h"
@@ -23,8 +24,7 @@ struct DecodedCapture {
 };
 
 DecodedCapture decodeCapture(const std::string& name, std::string_view technology) {
-    SystemLog::setSink([](int, const std::string&) {});
-    SystemLog::setThreshold(kLogError);
+    bench::quietLog();
     DecodedCapture decoded{LogGenerator::generatorFromTechnology(technology), PlistDictionary::create()};
     std::string error;
     forEachLogItem(

@@ -11,20 +11,14 @@
 #include <vector>
 
 #include "LogGenerator/UTRAN/UTRANLogGenerator.h"
+#include "bench/BenchFeeding.h"
 #include "core/platform/KxServerProtocol.h"
-#include "core/platform/SystemLog.h"
 #include "logfile/records/UtranRecords.h"
 
 namespace velmar {
 namespace {
 
 constexpr std::size_t kRefreshEvery = 100;
-
-// The default threshold (error); lines that pass it go to a sink that drops them instead of syslog(3).
-void quietLog() {
-    SystemLog::setSink([](int, const std::string&) {});
-    SystemLog::setThreshold(kLogError);
-}
 
 class StreamMaker {
   public:
@@ -140,23 +134,8 @@ const std::vector<PlistData>& utranStream() {
 }
 
 void feed(benchmark::State& state, const std::vector<PlistData>& blobs) {
-    quietLog();
     auto generator = UTRANLogGenerator::generator();
-    const StateDict stateDict = PlistDictionary::create();
-    std::size_t next = 0;
-    std::size_t sinceRefresh = 0;
-    std::size_t bytes = 0;
-    for (auto _ : state) {
-        generator->updateState(stateDict, blobs[next]);
-        bytes += blobs[next].size();
-        next = next + 1 == blobs.size() ? 0 : next + 1;
-        if (++sinceRefresh == kRefreshEvery) {
-            sinceRefresh = 0;
-            generator->generateLogUsingState(stateDict);
-        }
-    }
-    state.SetItemsProcessed(state.iterations());
-    state.SetBytesProcessed(static_cast<std::int64_t>(bytes));
+    bench::feedCycle(state, *generator, blobs, kRefreshEvery);
 }
 
 void BM_UtranStream(benchmark::State& state) {
