@@ -6,7 +6,7 @@ SHELL := /bin/bash
 DEBIAN_PACKAGES := build-essential cmake pkg-config clang libclang-rt-14-dev qt6-base-dev libexpat1-dev \
                    libncurses-dev googletest libgtest-dev libbenchmark-dev tmux
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
-FUZZ_SECONDS ?= 60
+FUZZ_SECONDS ?= 30
 DEMO_TECHNOLOGY ?= lte
 
 .PHONY: deps build build-asan build-fuzz test test-default test-asan fuzz bench demo format clean
