@@ -6,6 +6,7 @@
 #include <cmath>
 #include <cstdlib>
 
+#include "core/platform/CommandLine.h"
 #include "core/platform/KxServerProtocol.h"
 
 namespace velmar {
@@ -58,42 +59,6 @@ constexpr std::array<OptionScope, 8> kScopes = {{
 
 constexpr std::array<std::string_view, 3> kScenarios = {"drive", "walk", "static"};
 
-constexpr std::string_view kUsage =
-    R"(Usage: kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]
-                 [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
-                 [--scenario drive|walk|static] [--rate-multiplier X]
-
-The telephony service: owns one baseband source and serves log channels to monitor clients on the
-control port com.velmar.kxserver (a socket in $VELMAR_RUNTIME_DIR, else $XDG_RUNTIME_DIR/velmar, else
-/tmp/velmar-<uid>). Each client's start command names the log codes and extra codes it receives.
-
-  --source sim|replay|live  where the blobs come from (default: sim, the simulated baseband: a device
-                            in a small radio world of cells, logging every record of the technology)
-  --technology NAME         the technology answered to GetTechnology: gsm, lte (default), utran, cdma,
-                            or ifx (the object-based technology: every blob to every streaming channel)
-  --input FILE              replay: the recorded log (hex blob file, DLF, raw diagnostic-port capture or
-                            snapshot; told apart by extension, else by content)
-  --speed X                 replay: X times the recorded pace (default 1). Blobs are paced by their
-                            baseband timestamps, gaps of more than 3 seconds shortened to 3; a blob
-                            without a timestamp follows 1/50 s after the one before it
-  --fast                    replay: as fast as the streaming channels take the blobs, from the first
-                            start command on; a client that stops reading loses only its own oldest blobs
-  --loop                    replay: start again at the end (otherwise the service stays up, idle)
-  --seed N                  sim: seed of the simulated baseband (default 1); the same seed gives the
-                            same cells, route and events
-  --scenario NAME           sim: the device's route: drive (50 km/h, default), walk (5 km/h) or static
-  --rate-multiplier X       sim: simulated time runs X times faster than the wall clock (default 1), and
-                            every logging rate with it
-  --device PATH             live: the diagnostic port (character device or FIFO), read as a raw capture
-  --log-stderr              also write system-log lines to standard error as "<priority> text";
-                            VELMAR_LOG_LEVEL (error, warning, notice, info, debug) sets the threshold
-  --help                    show this help and exit
-
-SIGTERM or SIGINT closes every channel and the control port and exits with status 0. Exit status 1:
-the service could not start (another kxserverd is already running, unreadable input, device that cannot
-be opened); 2: usage error.
-)";
-
 bool appliesTo(const OptionScope& scope, SourceKind source) {
     switch (source) {
         case SourceKind::Sim:
@@ -119,7 +84,8 @@ std::string quoted(std::string_view text) {
     return "\"" + std::string(text) + "\"";
 }
 
-std::optional<double> parsePositiveNumber(const std::string& text) {
+std::optional<double> parsePositiveNumber(std::string_view given) {
+    const std::string text(given);
     if (text.empty()) {
         return std::nullopt;
     }
@@ -132,7 +98,8 @@ std::optional<double> parsePositiveNumber(const std::string& text) {
     return value;
 }
 
-std::optional<std::uint64_t> parseSeed(const std::string& text) {
+std::optional<std::uint64_t> parseSeed(std::string_view given) {
+    const std::string text(given);
     if (text.empty() || text.find_first_not_of("0123456789") != std::string::npos) {
         return std::nullopt;
     }
@@ -145,117 +112,148 @@ std::optional<std::uint64_t> parseSeed(const std::string& text) {
     return static_cast<std::uint64_t>(value);
 }
 
+// kxserverd's command line, its rows writing into options.
+CommandLine serviceCommandLine(ServiceOptions& options) {
+    CommandLine commandLine{
+        .usage = "Usage: kxserverd",
+        .description =
+            "The telephony service: owns one baseband source and serves log channels to monitor clients on "
+            "the control port com.velmar.kxserver (a socket in $VELMAR_RUNTIME_DIR, else "
+            "$XDG_RUNTIME_DIR/velmar, else /tmp/velmar-<uid>). Each client's start command names the log "
+            "codes and extra codes it receives.",
+        .options = {},
+        .epilogue =
+            "SIGTERM or SIGINT closes every channel and the control port and exits with status 0. Exit "
+            "status 1: the service could not start (another kxserverd is already running, unreadable "
+            "input, device that cannot be opened); 2: usage error.",
+    };
+    commandLine.options = {
+        {.name = "--source",
+         .value = "sim|replay|live",
+         .help = "where the blobs come from (default: sim, the simulated baseband: a device in a small radio "
+                 "world of cells, logging every record of the technology)",
+         .apply = [&options](std::string_view value) -> std::string {
+             const auto found =
+                 std::find_if(kSources.begin(), kSources.end(),
+                              [&value](const SourceName& source) { return source.name == value; });
+             if (found == kSources.end()) {
+                 return "unknown source " + quoted(value) + " (sim, replay or live)";
+             }
+             options.source = found->kind;
+             return "";
+         }},
+        {.name = "--technology",
+         .value = "NAME",
+         .help = "the technology answered to GetTechnology: gsm, lte (default), utran, cdma, or ifx (the "
+                 "object-based technology: every blob to every streaming channel)",
+         .apply = [&options](std::string_view value) -> std::string {
+             const auto found = std::find_if(
+                 kTechnologies.begin(), kTechnologies.end(),
+                 [&value](const TechnologyName& technology) { return technology.name == value; });
+             if (found == kTechnologies.end()) {
+                 return "unknown technology " + quoted(value) + " (gsm, lte, utran, cdma or ifx)";
+             }
+             options.technologyName = found->name;
+             return "";
+         },
+         .synopsis = "[--technology gsm|lte|utran|cdma|ifx]"},
+        {.name = "--input",
+         .value = "FILE",
+         .help =
+             "replay: the recorded log (hex blob file, DLF, raw diagnostic-port capture or snapshot; told "
+             "apart by extension, else by content)",
+         .apply = storesValue(options.input)},
+        {.name = "--speed",
+         .value = "X",
+         .help = "replay: X times the recorded pace (default 1). Blobs are paced by their baseband "
+                 "timestamps, gaps of more than 3 seconds shortened to 3; a blob without a timestamp follows "
+                 "1/50 s after the one before it",
+         .apply = [&options](std::string_view value) -> std::string {
+             const std::optional<double> speed = parsePositiveNumber(value);
+             if (!speed) {
+                 return "--speed needs a positive number, not " + quoted(value);
+             }
+             options.speed = *speed;
+             return "";
+         },
+         .synopsis = "[--speed X | --fast]"},
+        {.name = "--fast",
+         .value = "",
+         .help =
+             "replay: as fast as the streaming channels take the blobs, from the first start command on; a "
+             "client that stops reading loses only its own oldest blobs",
+         .apply = setsFlag(options.fast),
+         .inSynopsis = false},
+        {.name = "--loop",
+         .value = "",
+         .help = "replay: start again at the end (otherwise the service stays up, idle)",
+         .apply = setsFlag(options.loop)},
+        {.name = "--seed",
+         .value = "N",
+         .help = "sim: seed of the simulated baseband (default 1); the same seed gives the same cells, route "
+                 "and events",
+         .apply = [&options](std::string_view value) -> std::string {
+             const std::optional<std::uint64_t> seed = parseSeed(value);
+             if (!seed) {
+                 return "--seed needs a non-negative integer, not " + quoted(value);
+             }
+             options.seed = seed;
+             return "";
+         }},
+        {.name = "--device",
+         .value = "PATH",
+         .help = "live: the diagnostic port (character device or FIFO), read as a raw capture",
+         .apply = storesValue(options.device)},
+        logStderrOption(options.logStderr),
+        {.name = "--scenario",
+         .value = "NAME",
+         .help = "sim: the device's route: drive (50 km/h, default), walk (5 km/h) or static",
+         .apply = [&options](std::string_view value) -> std::string {
+             const auto found = std::find(kScenarios.begin(), kScenarios.end(), value);
+             if (found == kScenarios.end()) {
+                 return "unknown scenario " + quoted(value) + " (drive, walk or static)";
+             }
+             options.scenario = *found;
+             return "";
+         },
+         .synopsis = "[--scenario drive|walk|static]"},
+        {.name = "--rate-multiplier",
+         .value = "X",
+         .help = "sim: simulated time runs X times faster than the wall clock (default 1), and every logging "
+                 "rate with it",
+         .apply = [&options](std::string_view value) -> std::string {
+             const std::optional<double> rate = parsePositiveNumber(value);
+             if (!rate) {
+                 return "--rate-multiplier needs a positive number, not " + quoted(value);
+             }
+             options.rateMultiplier = *rate;
+             return "";
+         }},
+    };
+    return commandLine;
+}
+
 }  // namespace
 
-std::string_view serviceUsage() {
-    return kUsage;
+std::string serviceUsage() {
+    ServiceOptions unused;
+    return commandLineHelp(serviceCommandLine(unused));
 }
 
 ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& arguments) {
     ParsedServiceOptions parsed;
     ServiceOptions& options = parsed.options;
-    std::vector<std::string_view> given;  // source-specific options as given, in order
     const auto fail = [&parsed](std::string message) {
         parsed.error = std::move(message);
         return parsed;
     };
-
-    for (const std::string& argument : arguments) {
-        if (argument == "--help" || argument == "-h") {
-            parsed.help = true;
-            return parsed;
-        }
+    const CommandLineResult line = parseCommandLine(serviceCommandLine(options), arguments);
+    if (line.help) {
+        parsed.help = true;
+        return parsed;
     }
-    for (std::size_t index = 0; index < arguments.size(); ++index) {
-        const std::string& argument = arguments[index];
-        if (argument.rfind("--", 0) != 0 || argument.size() == 2) {
-            return fail("unexpected argument " + quoted(argument));
-        }
-        std::string name = argument;
-        std::optional<std::string> inlineValue;
-        if (const std::size_t equals = argument.find('='); equals != std::string::npos) {
-            name = argument.substr(0, equals);
-            inlineValue = argument.substr(equals + 1);
-        }
-        const bool isFlag = name == "--fast" || name == "--loop" || name == "--log-stderr";
-        std::string value;
-        if (isFlag) {
-            if (inlineValue) {
-                return fail(name + " takes no value");
-            }
-        } else if (name == "--source" || name == "--technology" || name == "--input" || name == "--speed" ||
-                   name == "--seed" || name == "--device" || name == "--scenario" ||
-                   name == "--rate-multiplier") {
-            if (inlineValue) {
-                value = *inlineValue;
-            } else if (index + 1 < arguments.size()) {
-                value = arguments[++index];
-            } else {
-                return fail(name + " needs a value");
-            }
-            if (value.empty()) {
-                return fail(name + " needs a value");
-            }
-        } else {
-            return fail("unknown option " + name);
-        }
-        for (const OptionScope& scope : kScopes) {
-            if (scope.option == name) {
-                given.push_back(scope.option);
-            }
-        }
-
-        if (name == "--source") {
-            const auto found =
-                std::find_if(kSources.begin(), kSources.end(),
-                             [&value](const SourceName& source) { return source.name == value; });
-            if (found == kSources.end()) {
-                return fail("unknown source " + quoted(value) + " (sim, replay or live)");
-            }
-            options.source = found->kind;
-        } else if (name == "--technology") {
-            const auto found =
-                std::find_if(kTechnologies.begin(), kTechnologies.end(),
-                             [&value](const TechnologyName& technology) { return technology.name == value; });
-            if (found == kTechnologies.end()) {
-                return fail("unknown technology " + quoted(value) + " (gsm, lte, utran, cdma or ifx)");
-            }
-            options.technologyName = found->name;
-        } else if (name == "--input") {
-            options.input = value;
-        } else if (name == "--device") {
-            options.device = value;
-        } else if (name == "--speed") {
-            const std::optional<double> speed = parsePositiveNumber(value);
-            if (!speed) {
-                return fail("--speed needs a positive number, not " + quoted(value));
-            }
-            options.speed = *speed;
-        } else if (name == "--seed") {
-            const std::optional<std::uint64_t> seed = parseSeed(value);
-            if (!seed) {
-                return fail("--seed needs a non-negative integer, not " + quoted(value));
-            }
-            options.seed = seed;
-        } else if (name == "--scenario") {
-            const auto found = std::find(kScenarios.begin(), kScenarios.end(), value);
-            if (found == kScenarios.end()) {
-                return fail("unknown scenario " + quoted(value) + " (drive, walk or static)");
-            }
-            options.scenario = *found;
-        } else if (name == "--rate-multiplier") {
-            const std::optional<double> rate = parsePositiveNumber(value);
-            if (!rate) {
-                return fail("--rate-multiplier needs a positive number, not " + quoted(value));
-            }
-            options.rateMultiplier = *rate;
-        } else if (name == "--fast") {
-            options.fast = true;
-        } else if (name == "--loop") {
-            options.loop = true;
-        } else if (name == "--log-stderr") {
-            options.logStderr = true;
-        }
+    if (!line.error.empty()) {
+        return fail(line.error);
     }
 
     for (const TechnologyName& technology : kTechnologies) {
@@ -264,11 +262,11 @@ ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& argumen
             options.objectBased = technology.objectBased;
         }
     }
-    const bool speedGiven = std::find(given.begin(), given.end(), "--speed") != given.end();
+    const bool speedGiven = std::find(line.given.begin(), line.given.end(), "--speed") != line.given.end();
     if (speedGiven && options.fast) {
         return fail("--speed and --fast exclude each other");
     }
-    for (const std::string_view option : given) {
+    for (const std::string_view option : line.given) {
         for (const OptionScope& scope : kScopes) {
             if (scope.option == option && !appliesTo(scope, options.source)) {
                 return fail(std::string(option) + " does not apply to --source " +

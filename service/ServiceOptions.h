@@ -4,10 +4,10 @@
 //             [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
 //             [--scenario drive|walk|static] [--rate-multiplier X]
 //
-// Contract: parseServiceOptions reads the arguments after the program name ("--name value" or
-// "--name=value"). It answers the options, or help (--help anywhere), or a one-line usage error: an unknown
-// option or value, a missing value, a bad number, --speed with --fast, a source without its input, or an
-// option that does not apply to the chosen source.
+// Contract: parseServiceOptions reads the arguments after the program name with the one command-line parser
+// (core/platform/CommandLine.h: "--name value" or "--name=value", --help anywhere wins). It answers the
+// options, or help, or a one-line usage error: an unknown option or value, a missing value, a bad number,
+// --speed with --fast, a source without its input, or an option that does not apply to the chosen source.
 #pragma once
 
 #include <cstdint>
@@ -43,6 +43,6 @@ struct ParsedServiceOptions {
 };
 
 ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& arguments);
-std::string_view serviceUsage();
+std::string serviceUsage();  // the --help text
 
 }  // namespace velmar

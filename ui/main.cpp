@@ -10,8 +10,10 @@
 #include <string_view>
 
 #include "LogGenerator/LogGenerator.h"
+#include "core/platform/CommandLine.h"
 #include "core/platform/StandardOutputDiversion.h"
 #include "core/platform/SystemLog.h"
+#include "ui/MonitorOptions.h"
 #include "ui/headless/HeadlessFrontEnd.h"
 #ifdef VELMAR_WITH_QT
 #include "ui/qt/QtFrontEnd.h"
@@ -33,32 +35,6 @@ constexpr bool kHaveTerminal = true;
 constexpr bool kHaveTerminal = false;
 #endif
 
-constexpr const char* kUsage =
-    "usage: velmar [--terminal | --headless [--path PATH]] [--fullscreen] [--log-stderr]\n"
-    "\n"
-    "Cellular radio diagnostics monitor. Connects to the telephony service kxserverd (retrying every 5 s\n"
-    "until it answers), decodes what the baseband reports and shows it as a tree of panes.\n"
-    "\n"
-    "  (default)       the graphical interface where DISPLAY, WAYLAND_DISPLAY or QT_QPA_PLATFORM is set;\n"
-    "                  otherwise the terminal interface when standard input and output are a terminal;\n"
-    "                  otherwise --headless\n"
-    "  --terminal      full-screen terminal interface: arrow keys, PgUp/PgDn, Home/End move; Enter or the\n"
-    "                  right arrow opens a row; left arrow, Backspace or Esc go back; s saves a snapshot\n"
-    "                  (internal builds); q quits\n"
-    "  --headless      no user interface: after launch and after every redraw, one JSON line on standard\n"
-    "                  output: {\"time\", \"connected\", \"status\", \"tree\"}\n"
-    "  --path PATH     with --headless, follow the pane at PATH (e.g. /LTE/Serving Cell Info) instead of "
-    "the\n"
-    "                  root; when PATH disappears the pane pops to its parent\n"
-    "  --fullscreen    the graphical interface fills the screen (kiosk devices); otherwise its window opens\n"
-    "                  at a phone-like size\n"
-    "  --log-stderr    mirror system-log lines to standard error as '<priority> <text>'\n"
-    "                  (VELMAR_LOG_LEVEL=error|warning|notice|info|debug sets how much; default error)\n"
-    "  --help          show this text\n"
-    "\n"
-    "Snapshots are saved to ${XDG_STATE_HOME:-~/.local/state}/velmar/diagnostics; the save button appears\n"
-    "only on internal builds (see README).\n";
-
 bool environmentSet(const char* name) {
     const char* value = std::getenv(name);
     return value != nullptr && *value != '\0';
@@ -75,45 +51,21 @@ velmar::GeneratorFactory generatorFactory() {
 int main(int argc, char** argv) {
     using namespace velmar;
     SystemLog::configureFromEnvironment("velmar");
-    enum class FrontEnd { Default, Gui, Terminal, Headless };
-    FrontEnd frontEnd = FrontEnd::Default;
-    std::string followedPath = "/";
-    bool fullscreen = false;
-    bool pathGiven = false;
-    bool logStderr = false;
-    for (int i = 1; i < argc; ++i) {
-        const std::string_view argument = argv[i];
-        if (argument == "--help" || argument == "-h") {
-            std::fputs(kUsage, stdout);
-            std::printf("\nThis build has: %s%sthe headless front end.\n",
-                        kHaveGui ? "the graphical interface, " : "",
-                        kHaveTerminal ? "the terminal interface, " : "");
-            return 0;
-        } else if (argument == "--headless" || argument == "--terminal") {
-            const FrontEnd chosen = argument == "--headless" ? FrontEnd::Headless : FrontEnd::Terminal;
-            if (frontEnd != FrontEnd::Default && frontEnd != chosen) {
-                std::fputs("velmar: --terminal and --headless exclude each other (see --help)\n", stderr);
-                return 2;
-            }
-            frontEnd = chosen;
-        } else if (argument == "--fullscreen") {
-            fullscreen = true;
-        } else if (argument == "--log-stderr") {
-            SystemLog::setMirrorToStderr(true);
-            logStderr = true;
-        } else if (argument == "--path" && i + 1 < argc) {
-            followedPath = argv[++i];
-            pathGiven = true;
-        } else {
-            std::fprintf(stderr, "velmar: unknown argument '%s' (see --help)\n", argv[i]);
-            return 2;
-        }
+    using FrontEnd = MonitorOptions::FrontEnd;
+    const ParsedMonitorOptions parsed = parseMonitorOptions(commandLineArguments(argc, argv));
+    if (parsed.help) {
+        std::fputs(monitorUsage(kHaveGui, kHaveTerminal).c_str(), stdout);
+        return 0;
     }
-    // --path only makes sense when the user asked for the headless front end, not when it was chosen for
-    // want of a display or a terminal.
-    if (pathGiven && frontEnd != FrontEnd::Headless) {
-        std::fputs("velmar: --path goes with --headless (see --help)\n", stderr);
+    if (!parsed.error.empty()) {
+        std::fprintf(stderr, "velmar: %s (see --help)\n", parsed.error.c_str());
         return 2;
+    }
+    FrontEnd frontEnd = parsed.options.frontEnd;
+    const bool fullscreen = parsed.options.fullscreen;
+    const bool logStderr = parsed.options.logStderr;
+    if (logStderr) {
+        SystemLog::setMirrorToStderr(true);
     }
     if (frontEnd == FrontEnd::Default) {
         const bool display = environmentSet("DISPLAY") || environmentSet("WAYLAND_DISPLAY") ||
@@ -156,6 +108,6 @@ int main(int argc, char** argv) {
             break;
     }
     const StandardOutputDiversion jsonOutput(logStderr);
-    HeadlessFrontEnd headless(generatorFactory(), followedPath, jsonOutput.stream());
+    HeadlessFrontEnd headless(generatorFactory(), parsed.options.followedPath, jsonOutput.stream());
     return headless.run();
 }

@@ -64,6 +64,7 @@ TEST(DecodeTool, UsageErrorsAreOneLineWithStatusTwo) {
          "velmar-decode: unknown output 'tree' (expected display or state) (see --help)\n"},
         {{"--technology", "lte", "--bogus", "x"}, "velmar-decode: unknown option '--bogus' (see --help)\n"},
         {{"--technology"}, "velmar-decode: --technology needs a value (see --help)\n"},
+        {{"--technology=lte", "--output=", "x"}, "velmar-decode: --output needs a value (see --help)\n"},
     };
     for (const Case& c : cases) {
         std::vector<std::string> arguments{kDecode};

@@ -50,6 +50,7 @@ TEST_F(CommandLineTest, RefusesCombinationsThatCannotWork) {
         {{"--fullscreen"},
          "velmar: --fullscreen needs the graphical interface (a display, and a build with Qt)\n"},
         {{"--colour"}, "velmar: unknown argument '--colour' (see --help)\n"},
+        {{"--headless", "--path"}, "velmar: --path needs a value (see --help)\n"},
     };
     for (const auto& [arguments, message] : cases) {
         std::vector<std::string> command = {VELMAR_PATH};

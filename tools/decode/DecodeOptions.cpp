@@ -2,41 +2,20 @@
 
 #include <string_view>
 
+#include "core/platform/CommandLine.h"
 #include "core/platform/KxServerProtocol.h"
 
 namespace velmar {
-
-const char* const kDecodeUsage =
-    "usage: velmar-decode --technology {gsm|lte|utran|cdma|ifx} [--format auto|hex|dlf|qmdl|velmar]\n"
-    "                     [--output display|state] [--every-tick] [--save-contents] [--start-command]\n"
-    "                     [--log-stderr] FILE...\n"
-    "\n"
-    "Feeds recorded baseband blobs through a technology's generator, exactly as the monitor does, and prints\n"
-    "the resulting display as JSON on standard output.\n"
-    "\n"
-    "  --technology T   gsm (GSM/UMTS), lte, utran, cdma (CDMA2000) or ifx (object-based GSM)\n"
-    "  --format F       input format; auto (default) decides by file extension, then by content:\n"
-    "                   hex (one blob per line, 'tick' lines refresh), dlf (DLF records), qmdl (raw\n"
-    "                   diagnostic-port capture), velmar (saved snapshot file)\n"
-    "  --output O       display (default): the state's \"Display\"; state: the whole state dictionary\n"
-    "  --every-tick     one JSON line per display refresh instead of one document at the end\n"
-    "  --save-contents  print the snapshot save contents (history entries and DLF file) instead\n"
-    "  --start-command  print the generator's start command and exit (no FILE needed)\n"
-    "  --log-stderr     mirror system-log lines to standard error as '<priority> <text>'\n"
-    "                   (VELMAR_LOG_LEVEL=error|warning|notice|info|debug sets how much; default error)\n"
-    "  --help           show this text\n"
-    "\n"
-    "A refresh runs at every 'tick' line of a hex file, after each entry of a snapshot file, and once after\n"
-    "the last blob. Data are shown as {\"$data\": base64}, dates as {\"$date\": ISO 8601 UTC}.\n"
-    "Exit status: 0 on success, 2 on a usage error or unreadable input.\n";
 
 std::string technologyConstantFor(const std::string& name) {
     static const struct {
         const char* name;
         std::string_view constant;
     } kTechnologies[] = {
-        {"gsm", kKxLogChannelTechnology_Orvane_GSM},   {"lte", kKxLogChannelTechnology_Orvane_LTE},
-        {"utran", kKxLogChannelTechnology_Orvane_UTRAN2}, {"cdma", kKxLogChannelTechnology_Orvane_CDMA},
+        {"gsm", kKxLogChannelTechnology_Orvane_GSM},
+        {"lte", kKxLogChannelTechnology_Orvane_LTE},
+        {"utran", kKxLogChannelTechnology_Orvane_UTRAN2},
+        {"cdma", kKxLogChannelTechnology_Orvane_CDMA},
         {"ifx", kKxLogChannelTechnology_IFX},
     };
     for (const auto& entry : kTechnologies) {
@@ -47,89 +26,106 @@ std::string technologyConstantFor(const std::string& name) {
     return std::string();
 }
 
-std::optional<DecodeOptions> parseDecodeOptions(int argc, char** argv, std::string& error) {
+namespace {
+
+// velmar-decode's command line, its rows writing into options.
+CommandLine decodeCommandLine(DecodeOptions& options) {
+    CommandLine commandLine{
+        .usage = "usage: velmar-decode",
+        .description =
+            "Feeds recorded baseband blobs through a technology's generator, exactly as the monitor "
+            "does, and prints the resulting display as JSON on standard output.",
+        .options = {},
+        .operands = "FILE...",
+        .takeOperand = [&options](std::string_view file) -> std::string {
+            options.files.emplace_back(file);
+            return "";
+        },
+        .epilogue =
+            "A refresh runs at every 'tick' line of a hex file, after each entry of a snapshot file, and "
+            "once after the last blob. Data are shown as {\"$data\": base64}, dates as {\"$date\": "
+            "ISO 8601 UTC}.\nExit status: 0 on success, 2 on a usage error or unreadable input.",
+        .wording = {.unknownOption = "unknown option '{}'", .takesNoValue = "option {} takes no value"},
+    };
+    commandLine.options = {
+        {.name = "--technology",
+         .value = "T",
+         .help = "gsm (GSM/UMTS), lte, utran, cdma (CDMA2000) or ifx (object-based GSM)",
+         .apply = [&options](std::string_view value) -> std::string {
+             if (technologyConstantFor(std::string(value)).empty()) {
+                 return "unknown technology '" + std::string(value) +
+                        "' (expected gsm, lte, utran, cdma or ifx)";
+             }
+             options.technology = value;
+             return "";
+         },
+         .synopsis = "--technology {gsm|lte|utran|cdma|ifx}"},
+        {.name = "--format",
+         .value = "F",
+         .help = "input format; auto (default) decides by file extension, then by content: hex (one blob per "
+                 "line, 'tick' lines refresh), dlf (DLF records), qmdl (raw diagnostic-port capture), velmar "
+                 "(saved snapshot file)",
+         .apply = [&options](std::string_view value) -> std::string {
+             const auto format = parseLogFormatName(value);
+             if (!format) {
+                 return "unknown format '" + std::string(value) +
+                        "' (expected auto, hex, dlf, qmdl or velmar)";
+             }
+             options.format = *format;
+             return "";
+         },
+         .synopsis = "[--format auto|hex|dlf|qmdl|velmar]"},
+        {.name = "--output",
+         .value = "O",
+         .help = "display (default): the state's \"Display\"; state: the whole state dictionary",
+         .apply = [&options](std::string_view value) -> std::string {
+             if (value == "display") {
+                 options.output = DecodeOptions::Output::Display;
+             } else if (value == "state") {
+                 options.output = DecodeOptions::Output::State;
+             } else {
+                 return "unknown output '" + std::string(value) + "' (expected display or state)";
+             }
+             return "";
+         },
+         .synopsis = "[--output display|state]"},
+        {.name = "--every-tick",
+         .value = "",
+         .help = "one JSON line per display refresh instead of one document at the end",
+         .apply = setsFlag(options.everyTick)},
+        {.name = "--save-contents",
+         .value = "",
+         .help = "print the snapshot save contents (history entries and DLF file) instead",
+         .apply = setsFlag(options.saveContents)},
+        {.name = "--start-command",
+         .value = "",
+         .help = "print the generator's start command and exit (no FILE needed)",
+         .apply = setsFlag(options.startCommand)},
+        logStderrOption(options.logStderr),
+    };
+    return commandLine;
+}
+
+}  // namespace
+
+std::string decodeUsage() {
+    DecodeOptions unused;
+    return commandLineHelp(decodeCommandLine(unused));
+}
+
+std::optional<DecodeOptions> parseDecodeOptions(const std::vector<std::string>& arguments,
+                                                std::string& error) {
     DecodeOptions options;
-    bool technologyGiven = false;
-    for (int i = 1; i < argc; ++i) {
-        const std::string_view argument = argv[i];
-        // Options take their value as the next argument or after "=".
-        std::string_view name = argument;
-        std::optional<std::string> inlineValue;
-        if (argument.starts_with("--") && argument.find('=') != std::string_view::npos) {
-            name = argument.substr(0, argument.find('='));
-            inlineValue = std::string(argument.substr(argument.find('=') + 1));
-        }
-        auto takeValue = [&](std::string& into) {
-            if (inlineValue) {
-                into = *inlineValue;
-                return true;
-            }
-            if (i + 1 >= argc) {
-                error = std::string(name) + " needs a value";
-                return false;
-            }
-            into = argv[++i];
-            return true;
-        };
-        std::string value;
-        if (name == "--technology") {
-            if (!takeValue(value)) {
-                return std::nullopt;
-            }
-            if (technologyConstantFor(value).empty()) {
-                error = "unknown technology '" + value + "' (expected gsm, lte, utran, cdma or ifx)";
-                return std::nullopt;
-            }
-            options.technology = value;
-            technologyGiven = true;
-        } else if (name == "--format") {
-            if (!takeValue(value)) {
-                return std::nullopt;
-            }
-            const auto format = parseLogFormatName(value);
-            if (!format) {
-                error = "unknown format '" + value + "' (expected auto, hex, dlf, qmdl or velmar)";
-                return std::nullopt;
-            }
-            options.format = *format;
-        } else if (name == "--output") {
-            if (!takeValue(value)) {
-                return std::nullopt;
-            }
-            if (value == "display") {
-                options.output = DecodeOptions::Output::Display;
-            } else if (value == "state") {
-                options.output = DecodeOptions::Output::State;
-            } else {
-                error = "unknown output '" + value + "' (expected display or state)";
-                return std::nullopt;
-            }
-        } else if (inlineValue) {
-            error = "option " + std::string(name) + " takes no value";
-            return std::nullopt;
-        } else if (name == "--every-tick") {
-            options.everyTick = true;
-        } else if (name == "--save-contents") {
-            options.saveContents = true;
-        } else if (name == "--start-command") {
-            options.startCommand = true;
-        } else if (name == "--log-stderr") {
-            options.logStderr = true;
-        } else if (name == "--help" || name == "-h") {
-            options.help = true;
-            return options;
-        } else if (name == "--") {
-            for (++i; i < argc; ++i) {
-                options.files.emplace_back(argv[i]);
-            }
-        } else if (name.starts_with("-") && name != "-") {
-            error = "unknown option '" + std::string(name) + "'";
-            return std::nullopt;
-        } else {
-            options.files.emplace_back(argument);
-        }
+    const CommandLineResult line = parseCommandLine(decodeCommandLine(options), arguments);
+    if (line.help) {
+        options.help = true;
+        return options;
     }
-    if (!technologyGiven) {
+    if (!line.error.empty()) {
+        error = line.error;
+        return std::nullopt;
+    }
+    if (options.technology.empty()) {
         error = "--technology is required (gsm, lte, utran, cdma or ifx)";
         return std::nullopt;
     }

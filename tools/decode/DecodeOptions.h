@@ -23,12 +23,14 @@ struct DecodeOptions {
     std::vector<std::string> files;
 };
 
-// Parses argv; on a usage error answers nullopt and sets error to a one-line message.
-std::optional<DecodeOptions> parseDecodeOptions(int argc, char** argv, std::string& error);
+// Parses the arguments after the program's name with the one command-line parser
+// (core/platform/CommandLine.h); on a usage error answers nullopt and sets error to a one-line message.
+std::optional<DecodeOptions> parseDecodeOptions(const std::vector<std::string>& arguments,
+                                                std::string& error);
 
 // The technology constant for a command-line technology name, or empty when the name is unknown.
 std::string technologyConstantFor(const std::string& name);
 
-extern const char* const kDecodeUsage;
+std::string decodeUsage();  // the --help text
 
 }  // namespace velmar

@@ -10,6 +10,7 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/StateKeys.h"
+#include "core/platform/CommandLine.h"
 #include "core/platform/Json.h"
 #include "core/platform/StandardOutputDiversion.h"
 #include "core/platform/SystemLog.h"
@@ -129,13 +130,13 @@ int main(int argc, char** argv) {
         }
     }
     std::string error;
-    const auto options = parseDecodeOptions(argc, argv, error);
+    const auto options = parseDecodeOptions(commandLineArguments(argc, argv), error);
     if (!options) {
         std::fprintf(stderr, "velmar-decode: %s (see --help)\n", error.c_str());
         return 2;
     }
     if (options->help) {
-        std::fputs(kDecodeUsage, stdout);
+        std::fputs(decodeUsage().c_str(), stdout);
         return 0;
     }
     SystemLog::setMirrorToStderr(options->logStderr);
