@@ -1,7 +1,9 @@
 #include "LogGenerator/DlfVersionReport.h"
 
-#include <array>
 #include <cstring>
+#include <vector>
+
+#include "core/platform/RecordWriter.h"
 
 namespace velmar {
 
@@ -18,12 +20,6 @@ constexpr TextField kBuildDateField{63, 18};
 constexpr std::size_t kTimeOffset = 81;
 constexpr std::size_t kZoneOffset = 85;
 constexpr std::size_t kDaylightOffset = 87;
-
-void putLittleEndian(std::uint8_t* at, std::uint64_t value, std::size_t width) {
-    for (std::size_t i = 0; i < width; ++i) {
-        at[i] = static_cast<std::uint8_t>(value >> (8 * i));
-    }
-}
 
 void putText(std::uint8_t* record, const TextField& field, const char* text) {
     if (text == nullptr) {
@@ -43,25 +39,27 @@ std::uint64_t packDlfTimeInfo(std::uint32_t secondsSince1970, std::int16_t zoneO
            (static_cast<std::uint64_t>(daylightSaving ? 1 : 0) << 48);
 }
 
-std::int32_t MoxDLFAddVersionReport(std::uint8_t* buffer, std::uint32_t bufferLength, std::uint32_t* outLength,
-                                    std::uint16_t firstNumber, std::uint16_t secondNumber,
-                                    const char* versionText, const char* executableName,
-                                    const char* buildDateText, std::uint64_t timeInfo) {
+std::int32_t MoxDLFAddVersionReport(std::uint8_t* buffer, std::uint32_t bufferLength,
+                                    std::uint32_t* outLength, std::uint16_t firstNumber,
+                                    std::uint16_t secondNumber, const char* versionText,
+                                    const char* executableName, const char* buildDateText,
+                                    std::uint64_t timeInfo) {
     *outLength = 0;
     if (bufferLength < kDlfVersionReportLength) {
         return 3;
     }
-    std::array<std::uint8_t, kDlfVersionReportLength> record{};
-    putLittleEndian(&record[0], kDlfVersionReportLength, 2);
-    putLittleEndian(&record[2], kDlfVersionReportCode, 2);
-    putLittleEndian(&record[12], firstNumber, 2);
-    putLittleEndian(&record[14], secondNumber, 2);
+    std::vector<std::uint8_t> record(kDlfVersionReportLength, 0);
+    RecordWriter(record)
+        .unsignedLE(0, 2, kDlfVersionReportLength)
+        .unsignedLE(2, 2, kDlfVersionReportCode)
+        .unsignedLE(12, 2, firstNumber)
+        .unsignedLE(14, 2, secondNumber)
+        .unsignedLE(kTimeOffset, 4, timeInfo & 0xFFFFFFFFu)
+        .unsignedLE(kZoneOffset, 2, (timeInfo >> 32) & 0xFFFFu)
+        .unsignedLE(kDaylightOffset, 2, (timeInfo >> 48) & 0xFFu);
     putText(record.data(), kVersionField, versionText);
     putText(record.data(), kExecutableField, executableName);
     putText(record.data(), kBuildDateField, buildDateText);
-    putLittleEndian(&record[kTimeOffset], timeInfo & 0xFFFFFFFFu, 4);
-    putLittleEndian(&record[kZoneOffset], (timeInfo >> 32) & 0xFFFFu, 2);
-    putLittleEndian(&record[kDaylightOffset], (timeInfo >> 48) & 0xFFu, 2);
     *outLength = kDlfVersionReportLength;
     std::memcpy(buffer, record.data(), record.size());
     return 0;

@@ -3,22 +3,12 @@
 #include <charconv>
 
 #include "LogGenerator/StateKeys.h"
+#include "core/platform/BasebandPacket.h"
 #include "core/platform/Resources.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 
 namespace velmar {
-
-namespace {
-
-constexpr std::size_t kMinimumBlobLength = 13;
-constexpr std::uint8_t kChannelPrefixMarker = 0x81;
-constexpr std::size_t kChannelPrefixLength = 2;
-constexpr std::uint8_t kPlainLogType = 1;
-constexpr std::uint8_t kExtendedLogType = 0xFF;
-constexpr std::int32_t kExtendedCodeBase = 0xFF0000;
-
-}  // namespace
 
 ORVLogGenerator2::Announcement ORVLogGenerator2::announce(const char* creationLine) {
     SystemLog::log(kLogError, "%s", creationLine);
@@ -26,11 +16,13 @@ ORVLogGenerator2::Announcement ORVLogGenerator2::announce(const char* creationLi
 }
 
 ORVLogGenerator2::CreationNoted ORVLogGenerator2::noteCreation(const ClassIndex* classIndex) {
-    SystemLog::log(kLogError, "Creating ORVLogGenerator2 object with %p", static_cast<const void*>(classIndex));
+    SystemLog::log(kLogError, "Creating ORVLogGenerator2 object with %p",
+                   static_cast<const void*>(classIndex));
     return {};
 }
 
-ORVLogGenerator2::ORVLogGenerator2(CreationNoted, std::string templateName, std::shared_ptr<ClassIndex> classIndex)
+ORVLogGenerator2::ORVLogGenerator2(CreationNoted, std::string templateName,
+                                   std::shared_ptr<ClassIndex> classIndex)
     : pListName(std::move(templateName)), cIndex(std::move(classIndex)) {
     SystemLog::log(kLogError, "Class Index: %ld", static_cast<long>(cIndex.use_count()));
 }
@@ -38,7 +30,8 @@ ORVLogGenerator2::ORVLogGenerator2(CreationNoted, std::string templateName, std:
 ORVLogGenerator2::ORVLogGenerator2(std::string templateName, std::shared_ptr<ClassIndex> classIndex)
     : ORVLogGenerator2{noteCreation(classIndex.get()), std::move(templateName), std::move(classIndex)} {}
 
-ORVLogGenerator2::ORVLogGenerator2(Announcement, std::string templateName, std::shared_ptr<ClassIndex> classIndex)
+ORVLogGenerator2::ORVLogGenerator2(Announcement, std::string templateName,
+                                   std::shared_ptr<ClassIndex> classIndex)
     : ORVLogGenerator2(std::move(templateName), std::move(classIndex)) {}
 
 ORVLogGenerator2::~ORVLogGenerator2() {
@@ -56,19 +49,16 @@ void ORVLogGenerator2::updateState(const StateDict& state, ByteView data) {
 
 void ORVLogGenerator2::updateWithData(ByteView data) {
     // The length test is made before the prefix is cut, so a prefixed blob of 13 or 14 bytes passes.
-    if (data.size() < kMinimumBlobLength) {
+    if (data.size() < kPacketHeaderLength) {
         return;
     }
-    const ByteView packet = data[0] == kChannelPrefixMarker ? data.subspan(kChannelPrefixLength) : data;
-    const std::uint8_t logType = packet[0];
-    if (logType != kPlainLogType && logType != kExtendedLogType) {
-        SystemLog::log(kLogError, "Invalid log type: %x. Dropping.", logType);
+    const BasebandPacket framed = frameBasebandPacket(data);
+    const ByteView packet = framed.packet;
+    if (!framed.isPlain() && !framed.isExtended()) {
+        SystemLog::log(kLogError, "Invalid log type: %x. Dropping.", framed.logType);
         return;
     }
-    std::int32_t code = static_cast<std::int32_t>(packet[3] | (packet[4] << 8));
-    if (logType == kExtendedLogType) {
-        code |= kExtendedCodeBase;
-    }
+    const std::int32_t code = framed.logCode();
     if (!cIndex) {
         return;
     }
@@ -94,8 +84,8 @@ PlistValue ORVLogGenerator2::getDisplayFromState(const StateDict& state) {
         templateValue = *loaded;
         state->set(state_keys::kTemplate, templateValue);
     }
-    SystemLog::log(kLogWarning, "Initialized class index: %p, Self: %p", static_cast<const void*>(cIndex.get()),
-                   static_cast<void*>(this));
+    SystemLog::log(kLogWarning, "Initialized class index: %p, Self: %p",
+                   static_cast<const void*>(cIndex.get()), static_cast<void*>(this));
     if (cIndex) {
         cIndex->status();
     }

@@ -13,7 +13,7 @@
 #include <span>
 #include <string>
 
-#include "LogGenerator/RecordReader.h"
+#include "core/platform/RecordReader.h"
 #include "core/platform/plist/PlistValue.h"
 
 namespace velmar {
@@ -140,13 +140,13 @@ constexpr RecordField u32Field(std::uint32_t offset, const char* key, ValueForma
 constexpr RecordField s32Field(std::uint32_t offset, const char* key, ValueFormat format = asInt()) {
     return {offset, 4, FieldEncoding::LittleSigned, 0, 0, key, format};
 }
-constexpr RecordField intField(std::uint32_t offset, std::uint8_t width, FieldEncoding encoding, const char* key,
-                               ValueFormat format = asInt()) {
+constexpr RecordField intField(std::uint32_t offset, std::uint8_t width, FieldEncoding encoding,
+                               const char* key, ValueFormat format = asInt()) {
     return {offset, width, encoding, 0, 0, key, format};
 }
 // Bits lowBit..highBit of the little-endian word of `width` bytes at offset.
-constexpr RecordField bitField(std::uint32_t offset, std::uint8_t width, std::uint8_t lowBit, std::uint8_t highBit,
-                               const char* key, ValueFormat format = asInt()) {
+constexpr RecordField bitField(std::uint32_t offset, std::uint8_t width, std::uint8_t lowBit,
+                               std::uint8_t highBit, const char* key, ValueFormat format = asInt()) {
     return {offset, width, FieldEncoding::Bits, lowBit, highBit, key, format};
 }
 

@@ -26,6 +26,7 @@
 #include <string>
 #include <vector>
 
+#include "core/platform/BasebandPacket.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/MessagePort.h"
 #include "core/platform/PollMainQueue.h"
@@ -59,9 +60,10 @@ const Capture& capture() {
         Capture result;
         std::set<std::int64_t> codes;
         for (const LogItem& item : readLogFile(kCapture).items) {
-            if (item.isBlob() && item.bytes.size() >= 5 && item.bytes[0] == 0x01) {
+            const BasebandPacket framed = frameBasebandPacket(item.bytes);
+            if (item.isBlob() && framed.hasCode() && framed.isPlain()) {
                 ++result.blobs;
-                codes.insert(item.bytes[3] | item.bytes[4] << 8);
+                codes.insert(framed.code);
             }
         }
         result.codes.assign(codes.begin(), codes.end());

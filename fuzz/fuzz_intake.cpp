@@ -2,9 +2,9 @@
 //
 // Input: byte 0 picks the generator (every log-code technology that this build's factory yields, or a class
 // index of byte-reading decoders for the framework alone); the rest is a sequence of blobs, each
-// [length u8][bytes]. A blob of length 0 stands for a display refresh. Nothing may crash, leak or read outside
-// a buffer. The one exception that the decoders throw on hostile data by design, the SIM-file parser's, is
-// an expected outcome.
+// [length u8][bytes]. A blob of length 0 stands for a display refresh. Nothing may crash, leak or read
+// outside a buffer. The one exception that the decoders throw on hostile data by design, the SIM-file
+// parser's, is an expected outcome.
 #include <cstddef>
 #include <cstdint>
 #include <cstdio>
@@ -15,10 +15,10 @@
 #include "LogGenerator/GSM/LogCode_0xFF0000.h"
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/ORVLogGenerator2.h"
-#include "LogGenerator/RecordReader.h"
 #include "core/ArrayLock.h"
 #include "core/VelmarModelNode.h"
 #include "core/platform/KxServerProtocol.h"
+#include "core/platform/RecordReader.h"
 #include "core/platform/SystemLog.h"
 
 namespace velmar {
@@ -26,7 +26,7 @@ namespace {
 
 // Reads every byte of whatever record it is handed, and keeps a row per record in its list section.
 class ByteReadingDecoder : public Base {
-public:
+  public:
     void updateWithData(ByteView data, std::int32_t) override {
         const RecordReader record(data);
         std::uint64_t sum = 0;
@@ -46,12 +46,12 @@ public:
 };
 
 class ByteReadingIndex : public ClassIndex {
-public:
+  public:
     ByteReadingIndex() { Base::initWithDict<ByteReadingDecoder>(classDict, codeDictionary); }
 };
 
 class FrameworkGenerator : public ORVLogGenerator2 {
-public:
+  public:
     FrameworkGenerator() : ORVLogGenerator2("FuzzFramework", std::make_shared<ByteReadingIndex>()) {}
 };
 

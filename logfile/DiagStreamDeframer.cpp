@@ -4,6 +4,8 @@
 #include <cstdio>
 #include <cstring>
 
+#include "core/platform/BasebandPacket.h"
+#include "core/platform/RecordReader.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/DiagCapture.h"
 #include "logfile/DlfFile.h"
@@ -11,10 +13,6 @@
 namespace velmar {
 
 namespace {
-
-std::uint16_t readLe16(const std::uint8_t* bytes) {
-    return static_cast<std::uint16_t>(bytes[0] | static_cast<unsigned>(bytes[1]) << 8);
-}
 
 std::string hex16(unsigned value) {
     char text[8];
@@ -111,7 +109,8 @@ void DiagStreamDeframer::frame(std::uint64_t offset, const std::uint8_t* escaped
             std::to_string(length) + (length == 1 ? " byte is" : " bytes are") + " too few for a frame");
         return;
     }
-    const std::uint16_t sent = readLe16(frame_.data() + length - 2);
+    const auto sent =
+        static_cast<std::uint16_t>(RecordReader(ByteView(frame_.data(), length)).u16(length - 2));
     const std::uint16_t computed = crc16X25(std::span(frame_.data(), length - 2));
     if (sent != computed) {
         bad(offset, "CRC " + hex16(sent) + " does not match the computed " + hex16(computed));
@@ -180,7 +179,7 @@ void DiagStreamDeframer::handle(std::uint64_t offset, std::size_t length) {
         bad(offset, "log packet of " + std::to_string(size) + " bytes is too short for a record length");
         return;
     }
-    const std::size_t recordLength = readLe16(packet + 4);
+    const std::size_t recordLength = RecordReader(ByteView(packet, size)).u16(4);
     if (recordLength < kDlfHeaderSize) {
         bad(offset, "record length " + std::to_string(recordLength) + " is shorter than the " +
                         std::to_string(kDlfHeaderSize) + "-byte header");
@@ -194,7 +193,7 @@ void DiagStreamDeframer::handle(std::uint64_t offset, std::size_t length) {
     ++stats_->logPackets;
     ++stats_->blobs;
     // The byte before the record becomes the blob's type byte, so the blob needs no copy.
-    packet[3] = kLogTypeOrdinary;
+    packet[3] = kPlainLogType;
     LogItemView item;
     item.bytes = std::span<const std::uint8_t>(packet + 3, 1 + recordLength);
     item.offset = offset;

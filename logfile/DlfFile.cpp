@@ -4,6 +4,10 @@
 #include <cstdio>
 #include <cstring>
 
+#include "core/platform/BasebandPacket.h"
+#include "core/platform/RecordReader.h"
+#include "core/platform/RecordWriter.h"
+
 namespace velmar {
 
 bool scanDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name,
@@ -18,7 +22,7 @@ bool scanDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name,
             error = where() + "1 trailing byte is too short for a record length";
             return false;
         }
-        const std::size_t length = bytes[offset] | static_cast<std::size_t>(bytes[offset + 1]) << 8;
+        const std::size_t length = RecordReader(bytes).u16(offset);
         if (length < kDlfHeaderSize) {
             error = where() + "record length " + std::to_string(length) + " is shorter than the " +
                     std::to_string(kDlfHeaderSize) + "-byte header";
@@ -29,7 +33,7 @@ bool scanDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name,
                     std::to_string(left) + " bytes left)";
             return false;
         }
-        blob.assign(1, kLogTypeOrdinary);
+        blob.assign(1, kPlainLogType);
         blob.insert(blob.end(), bytes.begin() + static_cast<std::ptrdiff_t>(offset),
                     bytes.begin() + static_cast<std::ptrdiff_t>(offset + length));
         LogItemView item;
@@ -74,14 +78,7 @@ bool appendDlfRecord(PlistData& out, std::uint16_t code, std::uint64_t timestamp
     }
     const std::size_t length = kDlfHeaderSize + payload.size();
     out.reserve(out.size() + length);
-    out.push_back(static_cast<std::uint8_t>(length & 0xFF));
-    out.push_back(static_cast<std::uint8_t>(length >> 8));
-    out.push_back(static_cast<std::uint8_t>(code & 0xFF));
-    out.push_back(static_cast<std::uint8_t>(code >> 8));
-    for (int shift = 0; shift < 64; shift += 8) {
-        out.push_back(static_cast<std::uint8_t>(timestamp >> shift));
-    }
-    out.insert(out.end(), payload.begin(), payload.end());
+    RecordWriter(out).appendLE(2, length).appendLE(2, code).appendLE(8, timestamp).append(payload);
     return true;
 }
 

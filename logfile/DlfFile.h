@@ -1,10 +1,11 @@
 // DlfFile: files of consecutive DLF records, the monitor's own export format.
 //
 // A record is [length u16 LE][code u16 LE][timestamp 8 bytes][payload], the length counting the whole
-// record. Reading yields one blob per record: the ordinary log type byte 0x01 followed by the record, which
-// is what a log-code generator receives live. A length below the 12-byte header, a record running past the
-// end of the file, or stray bytes too few for a length are errors naming the byte offset of the record:
-// "trace.dlf: offset 4096: record length 3 is shorter than the 12-byte header".
+// record. Reading yields one blob per record: the plain log type byte (kPlainLogType, BasebandPacket.h)
+// followed by the record, which is what a log-code generator receives live. A length below the 12-byte
+// header, a record running past the end of the file, or stray bytes too few for a length are errors naming
+// the byte offset of the record: "trace.dlf: offset 4096: record length 3 is shorter than the 12-byte
+// header".
 #pragma once
 
 #include <cstddef>
@@ -20,9 +21,6 @@ namespace velmar {
 // The DLF record header: length, code, timestamp.
 inline constexpr std::size_t kDlfHeaderSize = 12;
 inline constexpr std::size_t kDlfMaxRecordSize = 0xFFFF;
-// The type byte in front of a DLF record in a log packet.
-inline constexpr std::uint8_t kLogTypeOrdinary = 0x01;
-inline constexpr std::uint8_t kLogTypeExtended = 0xFF;
 
 // Streams the records of bytes as blobs (offset: where the record starts); name is used in messages.
 bool scanDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name,

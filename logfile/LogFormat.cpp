@@ -5,6 +5,7 @@
 #include <cctype>
 #include <cstring>
 
+#include "core/platform/RecordReader.h"
 #include "logfile/DiagCapture.h"
 #include "logfile/DlfFile.h"
 #include "logfile/HexBlobFile.h"
@@ -71,7 +72,7 @@ bool looksLikeDiagCapture(std::span<const std::uint8_t> bytes) {
         ++tried;
         if (!dangling && frame.size() >= 3) {
             const std::size_t body = frame.size() - 2;
-            const unsigned sent = frame[body] | static_cast<unsigned>(frame[body + 1]) << 8;
+            const unsigned sent = RecordReader(frame).u16(body);
             if (crc16X25(std::span(frame.data(), body)) == sent) {
                 return true;
             }

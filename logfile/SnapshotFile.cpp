@@ -1,5 +1,6 @@
 #include "logfile/SnapshotFile.h"
 
+#include "core/platform/BasebandPacket.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/DlfFile.h"
@@ -16,16 +17,14 @@ bool splitDisplayState(std::span<const std::uint8_t> data, std::size_t entry, co
     while (offset < data.size()) {
         const std::size_t left = data.size() - offset;
         const auto where = [&offset] { return "offset " + std::to_string(offset) + ": "; };
-        const std::size_t prefix =
-            data[offset] == kChannelPrefix ? kChannelPrefixSize : 0;  // the type byte is never 0x81
-        const std::size_t header = prefix + 1 + 2;                    // prefix, type byte, record length
-        if (left < header) {
+        const BasebandPacket framed = frameBasebandPacket(data.subspan(offset));
+        if (!framed.hasRecordLength()) {
             problem = where() + std::to_string(left) +
                       (left == 1 ? " trailing byte is" : " trailing bytes are") + " too few for a blob";
             return true;
         }
-        const std::size_t length =
-            data[offset + prefix + 1] | static_cast<std::size_t>(data[offset + prefix + 2]) << 8;
+        const std::size_t prefix = framed.prefixLength;
+        const std::size_t length = framed.recordLength;
         if (length < kDlfHeaderSize) {
             problem = where() + "record length " + std::to_string(length) + " is shorter than the " +
                       std::to_string(kDlfHeaderSize) + "-byte header";

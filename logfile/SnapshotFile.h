@@ -2,8 +2,9 @@
 //
 // A snapshot is a property-list dictionary {"Timestamp", "Data", "Description"}; "Data" is an array of
 // dictionaries. A history entry keeps under "DisplayState" (data) the raw blobs of one display interval,
-// concatenated: each is an optional 2-byte channel prefix 0x81 xx, a type byte, and a DLF record whose first
-// u16 (little-endian) is the record's length, so a blob is (prefix) + 1 + length bytes. Replaying re-feeds
+// concatenated: each is a blob as core/platform/BasebandPacket.h frames it (an optional 2-byte channel prefix
+// 0x81 xx, a type byte, and a DLF record whose first u16 is the record's length), so a blob is (prefix) + 1 +
+// length bytes. Replaying re-feeds
 // each blob exactly as the generator first received it (prefix included) and then a tick, once per entry.
 // Entries without "DisplayState" data (such as the closing {"Description", "DLF"} entry) are skipped.
 //
@@ -22,10 +23,6 @@
 #include "logfile/LogReadError.h"
 
 namespace velmar {
-
-// The first byte of a 2-byte channel prefix in front of a blob.
-inline constexpr std::uint8_t kChannelPrefix = 0x81;
-inline constexpr std::size_t kChannelPrefixSize = 2;
 
 // Streams the blobs and ticks of a snapshot already parsed into root; name is used in messages. Items carry
 // their 1-based entry and their offset in that entry's data (a tick: the data's size).

@@ -2,29 +2,18 @@
 
 #include <algorithm>
 
-#include "service/BasebandBlob.h"
+#include "core/platform/BasebandPacket.h"
 
 namespace velmar {
-
-namespace {
-constexpr std::size_t kPacketHeaderSize = 13;
-constexpr std::size_t kTimestampOffset = 5;
-constexpr std::uint8_t kTypeOrdinary = 0x01;
-constexpr std::uint8_t kTypeExtended = 0xFF;
-}  // namespace
 
 ReplayPacer::ReplayPacer(double speed) : speed_(speed > 0 ? speed : 1.0) {}
 
 std::optional<std::uint64_t> ReplayPacer::timestampTicks(ByteView blob) {
-    const ByteView packet = basebandPacket(blob);
-    if (packet.size() < kPacketHeaderSize || (packet[0] != kTypeOrdinary && packet[0] != kTypeExtended)) {
+    const BasebandPacket framed = frameBasebandPacket(blob);
+    if (!framed.hasHeader() || (!framed.isPlain() && !framed.isExtended())) {
         return std::nullopt;
     }
-    std::uint64_t raw = 0;
-    for (std::size_t i = 0; i < 8; ++i) {
-        raw |= static_cast<std::uint64_t>(packet[kTimestampOffset + i]) << (8 * i);
-    }
-    const std::uint64_t ticks = raw >> 16;
+    const std::uint64_t ticks = framed.timestamp >> 16;
     if (ticks == 0) {
         return std::nullopt;
     }

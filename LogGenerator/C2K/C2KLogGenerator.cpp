@@ -5,6 +5,7 @@
 #include "LogGenerator/C2K/C2KSortedPilots.h"
 #include "LogGenerator/C2K/C2KStateKeys.h"
 #include "LogGenerator/StateKeys.h"
+#include "core/platform/BasebandPacket.h"
 #include "core/platform/Resources.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
@@ -14,12 +15,6 @@ namespace velmar {
 namespace {
 
 constexpr const char* kTemplateName = "C2KTemplate";
-constexpr std::size_t kMinimumBlobLength = 13;
-constexpr std::uint8_t kChannelPrefixMarker = 0x81;
-constexpr std::size_t kChannelPrefixLength = 2;
-constexpr std::uint8_t kPlainLogType = 1;
-constexpr std::uint8_t kExtendedLogType = 0xFF;
-constexpr std::int32_t kExtendedCodeBase = 0xFF0000;
 
 }  // namespace
 
@@ -93,20 +88,17 @@ void C2KLogGenerator::updateState(const StateDict& state, ByteView data) {
 void C2KLogGenerator::updateFromLog(ByteView data, const PlistDictionaryRef& usingLookup,
                                     const StateDict& usingState) {
     // The length test is made before the prefix is cut, as the other generators make it.
-    if (data.size() < kMinimumBlobLength) {
+    if (data.size() < kPacketHeaderLength) {
         return;
     }
-    const ByteView packet = data[0] == kChannelPrefixMarker ? data.subspan(kChannelPrefixLength) : data;
-    const std::uint8_t logType = packet[0];
-    if (logType != kPlainLogType) {
+    const BasebandPacket framed = frameBasebandPacket(data);
+    const ByteView packet = framed.packet;
+    if (!framed.isPlain()) {
         // Logged only: the packet is processed all the same.
-        SystemLog::log(kLogError, "Invalid log type: %x. Dropping.", logType);
+        SystemLog::log(kLogError, "Invalid log type: %x. Dropping.", framed.logType);
     }
     const RecordReader reader(packet);
-    std::int32_t code = static_cast<std::int32_t>(reader.u16(3));
-    if (logType == kExtendedLogType) {
-        code += kExtendedCodeBase;
-    }
+    const std::int32_t code = framed.logCode();
     const c2k::C2KLogParser parse = c2k::parserForCode(code);
     if (parse == nullptr) {
         return;

@@ -9,7 +9,7 @@
 #include <cstdint>
 
 #include "LogGenerator/C2K/C2KDisplaySetter.h"
-#include "LogGenerator/RecordReader.h"
+#include "core/platform/RecordReader.h"
 
 namespace velmar::c2k {
 

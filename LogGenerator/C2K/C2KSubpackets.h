@@ -12,7 +12,7 @@
 #include <cstdint>
 #include <optional>
 
-#include "LogGenerator/RecordReader.h"
+#include "core/platform/RecordReader.h"
 
 namespace velmar::c2k {
 

@@ -12,7 +12,7 @@
 #include <cstdint>
 
 #include "LogGenerator/GSM/CountedList.h"
-#include "LogGenerator/RecordReader.h"
+#include "core/platform/RecordReader.h"
 
 namespace velmar {
 

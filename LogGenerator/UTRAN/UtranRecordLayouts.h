@@ -5,7 +5,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "LogGenerator/RecordReader.h"
+#include "core/platform/RecordReader.h"
 
 namespace velmar::utran_layout::channel_quality {
 

@@ -1,5 +1,6 @@
 #include "logfile/records/CdmaRecords.h"
 
+#include "core/platform/RecordWriter.h"
 #include "logfile/records/RecordBuilder.h"
 
 namespace velmar {
@@ -13,21 +14,12 @@ PlistData subpacketBytes(const CdmaSubpacket& subpacket) {
     PlistData bytes(kSubpacketHeaderLength, 0);
     const std::uint16_t size = subpacket.declaredSize.value_or(
         static_cast<std::uint16_t>(kSubpacketHeaderLength + subpacket.body.size()));
-    bytes[0] = subpacket.identifier;
-    bytes[1] = subpacket.version;
-    bytes[2] = static_cast<std::uint8_t>(size & 0xFF);
-    bytes[3] = static_cast<std::uint8_t>(size >> 8);
-    bytes.insert(bytes.end(), subpacket.body.begin(), subpacket.body.end());
+    RecordWriter(bytes)
+        .unsignedLE(0, 1, subpacket.identifier)
+        .unsignedLE(1, 1, subpacket.version)
+        .unsignedLE(2, 2, size)
+        .append(subpacket.body);
     return bytes;
-}
-
-void putLE(PlistData& bytes, std::size_t offset, std::size_t width, std::uint64_t value) {
-    if (bytes.size() < offset + width) {
-        bytes.resize(offset + width, 0);
-    }
-    for (std::size_t i = 0; i < width; ++i) {
-        bytes[offset + i] = static_cast<std::uint8_t>(value >> (8 * i));
-    }
 }
 
 PlistData buildSubpacketRecord(std::uint16_t code, const CdmaSubpacketRecord& record,
@@ -98,14 +90,15 @@ CdmaSubpacket cdma1xRadioSubpacket(const Cdma1xRadio& radio) {
     CdmaSubpacket subpacket;
     subpacket.identifier = 2;
     PlistData whole(kSubpacketHeaderLength, 0);
-    putLE(whole, 4, 1, radio.rx0BandClass);
-    putLE(whole, 5, 1, radio.rx1BandClass);
-    putLE(whole, 6, 2, radio.rx0Channel);
-    putLE(whole, 8, 2, radio.rx1Channel);
-    putLE(whole, 10, 1, static_cast<std::uint8_t>(radio.rxAgc0));
-    putLE(whole, 11, 1, static_cast<std::uint8_t>(radio.rxAgc1));
-    putLE(whole, 12, 2, static_cast<std::uint16_t>(radio.txPower));
-    putLE(whole, 14, 2, 0);
+    RecordWriter writer(whole);
+    writer.unsignedLE(4, 1, radio.rx0BandClass);
+    writer.unsignedLE(5, 1, radio.rx1BandClass);
+    writer.unsignedLE(6, 2, radio.rx0Channel);
+    writer.unsignedLE(8, 2, radio.rx1Channel);
+    writer.unsignedLE(10, 1, static_cast<std::uint8_t>(radio.rxAgc0));
+    writer.unsignedLE(11, 1, static_cast<std::uint8_t>(radio.rxAgc1));
+    writer.unsignedLE(12, 2, static_cast<std::uint16_t>(radio.txPower));
+    writer.unsignedLE(14, 2, 0);
     subpacket.body.assign(whole.begin() + kSubpacketHeaderLength, whole.end());
     return subpacket;
 }
@@ -114,17 +107,19 @@ CdmaSubpacket cdma1xActiveSetSubpacket(const Cdma1xActiveSet& activeSet) {
     CdmaSubpacket subpacket;
     subpacket.identifier = 3;
     PlistData whole(12, 0);
-    putLE(whole, 4, 2, activeSet.l);
-    putLE(whole, 6, 1, activeSet.m);
-    putLE(whole, 7, 1, activeSet.q);
-    putLE(whole, 8, 1, activeSet.declaredCount.value_or(static_cast<std::uint8_t>(activeSet.pilots.size())));
-    putLE(whole, 9, 1, activeSet.f);
-    putLE(whole, 10, 2, activeSet.referencePn);
+    RecordWriter writer(whole);
+    writer.unsignedLE(4, 2, activeSet.l);
+    writer.unsignedLE(6, 1, activeSet.m);
+    writer.unsignedLE(7, 1, activeSet.q);
+    writer.unsignedLE(8, 1,
+                      activeSet.declaredCount.value_or(static_cast<std::uint8_t>(activeSet.pilots.size())));
+    writer.unsignedLE(9, 1, activeSet.f);
+    writer.unsignedLE(10, 2, activeSet.referencePn);
     const std::size_t entrySize = (6 * std::size_t{activeSet.f} + 15) & ~std::size_t{3};
     for (std::size_t i = 0; i < activeSet.pilots.size(); ++i) {
         const std::size_t entry = entrySize * i;
-        putLE(whole, entry + 12, 2, activeSet.pilots[i].pn);
-        putLE(whole, entry + 24 + 4 * std::size_t{activeSet.f}, 2, activeSet.pilots[i].energy);
+        writer.unsignedLE(entry + 12, 2, activeSet.pilots[i].pn);
+        writer.unsignedLE(entry + 24 + 4 * std::size_t{activeSet.f}, 2, activeSet.pilots[i].energy);
     }
     subpacket.body.assign(whole.begin() + kSubpacketHeaderLength, whole.end());
     return subpacket;

@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "core/platform/BasebandPacket.h"
 #include "logfile/LogFormat.h"
 #include "tests/support/TestPaths.h"
 
@@ -68,7 +69,7 @@ TEST(DlfFile, RoundTripThroughAFile) {
     EXPECT_EQ(result.items[1], LogItem::blob(blobOf(kSecond), kFirst.size()));
     EXPECT_EQ(result.stats.blobs, 2U);
     for (const LogItem& item : result.items) {
-        EXPECT_EQ(item.bytes[0], kLogTypeOrdinary);
+        EXPECT_EQ(item.bytes[0], kPlainLogType);
         EXPECT_EQ(static_cast<std::size_t>(item.bytes[1] | item.bytes[2] << 8), item.bytes.size() - 1);
     }
 }
@@ -176,7 +177,7 @@ TEST(DlfFile, RandomBytesYieldWellFormedBlobsOrAnError) {
             bytes, "random.dlf",
             [&](const LogItemView& item) {
                 EXPECT_EQ(item.offset, covered);
-                EXPECT_EQ(item.bytes[0], kLogTypeOrdinary);
+                EXPECT_EQ(item.bytes[0], kPlainLogType);
                 EXPECT_EQ(static_cast<std::size_t>(item.bytes[1] | item.bytes[2] << 8),
                           item.bytes.size() - 1);
                 EXPECT_TRUE(std::equal(item.bytes.begin() + 1, item.bytes.end(), bytes.begin() + covered));

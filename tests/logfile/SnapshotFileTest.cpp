@@ -142,7 +142,7 @@ TEST(SnapshotFile, RandomDataNeverYieldsABlobOutsideTheEntry) {
             const LogItem& item = result.items[i];
             ASSERT_TRUE(item.isBlob());
             EXPECT_EQ(item.offset, covered);
-            const std::size_t prefix = item.bytes[0] == kChannelPrefix ? kChannelPrefixSize : 0;
+            const std::size_t prefix = item.bytes[0] == 0x81 ? 2 : 0;  // the channel prefix
             ASSERT_GE(item.bytes.size(), prefix + 3);
             const std::size_t length = item.bytes[prefix + 1] | item.bytes[prefix + 2] << 8;
             EXPECT_GE(length, 12U);

@@ -14,7 +14,7 @@
 namespace velmar {
 
 class RecordReader {
-public:
+  public:
     explicit RecordReader(ByteView bytes) : bytes_(bytes) {}
 
     std::size_t size() const { return bytes_.size(); }
@@ -70,7 +70,7 @@ public:
         return static_cast<std::uint32_t>((word >> lowBit) & mask);
     }
 
-private:
+  private:
     ByteView bytes_;
 };
 
