@@ -4,6 +4,7 @@
 
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/BasebandPacket.h"
+#include "core/platform/KxServerProtocol.h"
 #include "core/platform/Resources.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
@@ -179,9 +180,9 @@ PlistValue ORVLogGenerator2::getStartCommand() {
         }
     }
     auto command = PlistDictionary::create();
-    command->set("SetState", "Streaming");
-    command->set("SetOrvaneLogCodes", std::move(plainCodes));
-    command->set("SetKxExtraCodes", std::move(extraCodes));
+    command->set(kKxSetStateKey, kKxStreamingState);
+    command->set(kKxSetLogCodesKey, std::move(plainCodes));
+    command->set(kKxSetExtraCodesKey, std::move(extraCodes));
     return command;
 }
 

@@ -4,9 +4,9 @@
 // "sim s per s" says how many times faster than real time the simulator runs.
 #include <benchmark/benchmark.h>
 
-#include <array>
 #include <string>
 
+#include "core/platform/TechnologyNames.h"
 #include "service/sim/SimRandom.h"
 #include "service/sim/SimulatedBaseband.h"
 #include "service/sim/TechnologyEmitter.h"
@@ -15,7 +15,6 @@ namespace velmar {
 namespace {
 
 constexpr double kSimulatedSeconds = 120.0;
-constexpr std::array<const char*, 5> kTechnologies = {"gsm", "lte", "utran", "cdma", "ifx"};
 
 void simulate(benchmark::State& state, const std::string& technology) {
     std::uint64_t blobs = 0;
@@ -42,12 +41,12 @@ void simulate(benchmark::State& state, const std::string& technology) {
 // Registers a benchmark per technology whose simulator exists.
 int registerSimulators() {
     int registered = 0;
-    for (const char* technology : kTechnologies) {
+    for (const TechnologyName& technology : kTechnologyNames) {
         sim::SimRandom probe(1);
-        if (!sim::makeTechnologyEmitter(technology, probe)) {
+        if (!sim::makeTechnologyEmitter(technology.name, probe)) {
             continue;
         }
-        const std::string name = technology;
+        const std::string name(technology.name);
         benchmark::RegisterBenchmark(("Simulator/" + name).c_str(), [name](benchmark::State& state) {
             simulate(state, name);
         })->Unit(benchmark::kMillisecond);

@@ -1,5 +1,6 @@
 // The log channel of VelmarModel: opening the ports, the technology query and the port callbacks.
 #include "core/VelmarModel.h"
+#include "core/platform/KxServerProtocol.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 
@@ -66,7 +67,7 @@ bool VelmarModel::createPorts() {
 
 void VelmarModel::configureGenerator() {
     auto request = PlistDictionary::create();
-    request->set("GetTechnology", "GetTechnology");
+    request->set(kKxGetTechnologyKey, kKxGetTechnologyKey);
     const auto encoded = serializeXml(request);
     if (!encoded) {
         SystemLog::log(kLogError, " Could not generate GetTechnology command; cannot configure");
@@ -88,7 +89,7 @@ void VelmarModel::configureGenerator() {
         return;
     }
     const PlistDictionaryRef& fields = reply->dictionary();
-    const PlistValue* answer = fields ? fields->find("GetTechnology") : nullptr;
+    const PlistValue* answer = fields ? fields->find(kKxGetTechnologyKey) : nullptr;
     if (answer == nullptr) {
         SystemLog::log(kLogError, " ***** Reply to GetTechnology had no answer; cannot configure");
         return;
@@ -110,6 +111,8 @@ void VelmarModel::onLogChannelInvalidated(MessagePort* port) {
     restartMonitor();
 }
 
-void VelmarModel::onTelephonyServiceEvent() { refresh(); }
+void VelmarModel::onTelephonyServiceEvent() {
+    refresh();
+}
 
 }  // namespace velmar

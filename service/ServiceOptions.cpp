@@ -7,25 +7,11 @@
 #include <cstdlib>
 
 #include "core/platform/CommandLine.h"
-#include "core/platform/KxServerProtocol.h"
+#include "core/platform/TechnologyNames.h"
 
 namespace velmar {
 
 namespace {
-
-struct TechnologyName {
-    std::string_view name;
-    std::string_view constant;
-    bool objectBased;
-};
-
-constexpr std::array<TechnologyName, 5> kTechnologies = {{
-    {"gsm", kKxLogChannelTechnology_Orvane_GSM, false},
-    {"lte", kKxLogChannelTechnology_Orvane_LTE, false},
-    {"utran", kKxLogChannelTechnology_Orvane_UTRAN2, false},
-    {"cdma", kKxLogChannelTechnology_Orvane_CDMA, false},
-    {"ifx", kKxLogChannelTechnology_IFX, true},
-}};
 
 struct SourceName {
     std::string_view name;
@@ -147,16 +133,14 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
          .help = "the technology answered to GetTechnology: gsm, lte (default), utran, cdma, or ifx (the "
                  "object-based technology: every blob to every streaming channel)",
          .apply = [&options](std::string_view value) -> std::string {
-             const auto found = std::find_if(
-                 kTechnologies.begin(), kTechnologies.end(),
-                 [&value](const TechnologyName& technology) { return technology.name == value; });
-             if (found == kTechnologies.end()) {
-                 return "unknown technology " + quoted(value) + " (gsm, lte, utran, cdma or ifx)";
+             const TechnologyName* found = technologyNamed(value);
+             if (found == nullptr) {
+                 return "unknown technology " + quoted(value) + " (" + technologyNameList(", ", " or ") + ")";
              }
              options.technologyName = found->name;
              return "";
          },
-         .synopsis = "[--technology gsm|lte|utran|cdma|ifx]"},
+         .synopsis = "[--technology " + technologyNameList("|", "|") + "]"},
         {.name = "--input",
          .value = "FILE",
          .help =
@@ -256,11 +240,9 @@ ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& argumen
         return fail(line.error);
     }
 
-    for (const TechnologyName& technology : kTechnologies) {
-        if (technology.name == options.technologyName) {
-            options.technology = technology.constant;
-            options.objectBased = technology.objectBased;
-        }
+    if (const TechnologyName* technology = technologyNamed(options.technologyName)) {
+        options.technology = technology->constant;
+        options.objectBased = technology->objectBased;
     }
     const bool speedGiven = std::find(line.given.begin(), line.given.end(), "--speed") != line.given.end();
     if (speedGiven && options.fast) {

@@ -6,6 +6,7 @@
 #include "LogGenerator/C2K/C2KStateKeys.h"
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/BasebandPacket.h"
+#include "core/platform/KxServerProtocol.h"
 #include "core/platform/Resources.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
@@ -122,8 +123,8 @@ PlistValue C2KLogGenerator::getStartCommand() {
         codes->append(PlistValue::integer(code));
     }
     auto command = PlistDictionary::create();
-    command->set("SetState", "Streaming");
-    command->set("SetOrvaneLogCodes", std::move(codes));
+    command->set(kKxSetStateKey, kKxStreamingState);
+    command->set(kKxSetLogCodesKey, std::move(codes));
     return command;
 }
 

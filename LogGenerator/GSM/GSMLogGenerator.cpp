@@ -2,6 +2,7 @@
 
 #include "LogGenerator/GSM/InternalInconsistencyException.h"
 #include "LogGenerator/StateKeys.h"
+#include "core/platform/KxServerProtocol.h"
 #include "core/platform/StringFormat.h"
 #include "core/platform/plist/PlistCodec.h"
 
@@ -86,7 +87,7 @@ PlistValue GSMLogGenerator::generateLogUsingState(const StateDict& state) {
 
 PlistValue GSMLogGenerator::getStartCommand() {
     auto command = PlistDictionary::create();
-    command->set("SetState", "Streaming");
+    command->set(kKxSetStateKey, kKxStreamingState);
     return command;
 }
 

@@ -112,7 +112,7 @@ std::string labelOf(const CommandLineOption& option) {
 
 std::string synopsisOf(const CommandLineOption& option) {
     if (!option.synopsis.empty()) {
-        return std::string(option.synopsis);
+        return option.synopsis;
     }
     return "[" + labelOf(option) + "]";
 }

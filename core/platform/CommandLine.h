@@ -26,11 +26,11 @@ namespace velmar {
 struct CommandLineOption {
     std::string_view name;   // "--speed"
     std::string_view value;  // the value's placeholder ("X", "FILE"); empty for a flag
-    std::string_view help;   // one paragraph, word-wrapped to the help's width; '\n' forces a break
+    std::string help;        // one paragraph, word-wrapped to the help's width; '\n' forces a break
     // Takes the option's value (empty for a flag) and answers a usage error, or "" when it is accepted.
     std::function<std::string(std::string_view value)> apply;
-    std::string_view synopsis = {};  // the usage line's fragment; empty: "[--name VALUE]"
-    bool inSynopsis = true;          // false: another row's fragment already shows this option
+    std::string synopsis = {};  // the usage line's fragment; empty: "[--name VALUE]"
+    bool inSynopsis = true;     // false: another row's fragment already shows this option
 };
 
 // How a program words its usage errors; "{}" stands for the argument. The defaults suit most programs;

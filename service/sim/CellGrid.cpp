@@ -4,6 +4,8 @@
 #include <cmath>
 #include <cstdint>
 
+#include "core/platform/TechnologyNames.h"
+
 namespace velmar::sim {
 
 namespace {
@@ -34,6 +36,22 @@ std::vector<SitePosition> sitePositions() {
 // The GSM 900 channels of the plan: a 12-channel reuse over the grid.
 constexpr std::array<std::uint32_t, 12> kGsmChannels = {2, 5, 8, 11, 14, 17, 20, 23, 26, 29, 32, 35};
 
+// The radio access technology of the cells that a technology's device camps on.
+CellRat mainRatOf(Technology technology) {
+    switch (technology) {
+        case Technology::Cdma:
+            return CellRat::Cdma;
+        case Technology::Utran:
+            return CellRat::Umts;
+        case Technology::Gsm:
+        case Technology::ObjectBased:
+            return CellRat::Gsm;
+        case Technology::Lte:
+            break;
+    }
+    return CellRat::Lte;
+}
+
 }  // namespace
 
 double sectorAzimuthDegrees(int sector) {
@@ -47,11 +65,10 @@ std::vector<SimCell> buildCellGrid(std::string_view technology, SimRandom& rando
     sectorOf.clear();
     // A per-world offset makes seeds differ in their identities as well as in their levels.
     const std::uint32_t plan = static_cast<std::uint32_t>(random.integer(0, 15));
-    const bool dualLayer = technology == "gsm";
-    const CellRat mainRat = technology == "cdma"                         ? CellRat::Cdma
-                            : technology == "utran"                      ? CellRat::Umts
-                            : technology == "gsm" || technology == "ifx" ? CellRat::Gsm
-                                                                         : CellRat::Lte;
+    const TechnologyName* named = technologyNamed(technology);
+    const Technology kind = named != nullptr ? named->technology : Technology::Lte;
+    const bool dualLayer = kind == Technology::Gsm;
+    const CellRat mainRat = mainRatOf(kind);
     auto add = [&](CellRat rat, std::size_t site, int sector) {
         SimCell cell;
         cell.index = static_cast<int>(cells.size());

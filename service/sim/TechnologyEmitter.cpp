@@ -1,7 +1,6 @@
 #include "service/sim/TechnologyEmitter.h"
 
-#include <array>
-
+#include "core/platform/TechnologyNames.h"
 #include "service/sim/CdmaEmitter.h"
 #include "service/sim/GsmEmitter.h"
 #include "service/sim/LteEmitter.h"
@@ -10,39 +9,22 @@
 
 namespace velmar::sim {
 
-namespace {
-
-using EmitterCreator = std::unique_ptr<TechnologyEmitter> (*)(SimRandom& random);
-
-struct EmitterRow {
-    std::string_view technology;
-    EmitterCreator create;
-};
-
-std::unique_ptr<TechnologyEmitter> lteEmitter(SimRandom& random) {
-    return std::make_unique<LteEmitter>(random);
-}
-
-std::unique_ptr<TechnologyEmitter> cdmaEmitter(SimRandom& random) {
-    return std::make_unique<CdmaEmitter>(random);
-}
-
-// One row per technology name.
-const std::array<EmitterRow, 5> kEmitters = {{
-    {"gsm", &makeGsmEmitter},
-    {"lte", &lteEmitter},
-    {"utran", &makeUtranEmitter},
-    {"cdma", &cdmaEmitter},
-    {"ifx", &makeObjectBlobEmitter},
-}};
-
-}  // namespace
-
 std::unique_ptr<TechnologyEmitter> makeTechnologyEmitter(std::string_view technology, SimRandom& random) {
-    for (const EmitterRow& row : kEmitters) {
-        if (row.technology == technology) {
-            return row.create(random);
-        }
+    const TechnologyName* named = technologyNamed(technology);
+    if (named == nullptr) {
+        return nullptr;
+    }
+    switch (named->technology) {
+        case Technology::Gsm:
+            return makeGsmEmitter(random);
+        case Technology::Lte:
+            return std::make_unique<LteEmitter>(random);
+        case Technology::Utran:
+            return makeUtranEmitter(random);
+        case Technology::Cdma:
+            return std::make_unique<CdmaEmitter>(random);
+        case Technology::ObjectBased:
+            return makeObjectBlobEmitter(random);
     }
     return nullptr;
 }

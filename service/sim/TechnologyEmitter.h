@@ -27,7 +27,7 @@ class TechnologyEmitter {
     virtual void step(const RadioSnapshot& snapshot, const BlobOutput& emit) = 0;
 };
 
-// The emitter of a technology name ("gsm", "lte", "utran", "cdma", "ifx"); null for an unknown name.
+// The emitter of a technology's short name (core/platform/TechnologyNames.h); null for an unknown name.
 std::unique_ptr<TechnologyEmitter> makeTechnologyEmitter(std::string_view technology, SimRandom& random);
 
 }  // namespace velmar::sim

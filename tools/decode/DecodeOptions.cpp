@@ -3,28 +3,9 @@
 #include <string_view>
 
 #include "core/platform/CommandLine.h"
-#include "core/platform/KxServerProtocol.h"
+#include "core/platform/TechnologyNames.h"
 
 namespace velmar {
-
-std::string technologyConstantFor(const std::string& name) {
-    static const struct {
-        const char* name;
-        std::string_view constant;
-    } kTechnologies[] = {
-        {"gsm", kKxLogChannelTechnology_Orvane_GSM},
-        {"lte", kKxLogChannelTechnology_Orvane_LTE},
-        {"utran", kKxLogChannelTechnology_Orvane_UTRAN2},
-        {"cdma", kKxLogChannelTechnology_Orvane_CDMA},
-        {"ifx", kKxLogChannelTechnology_IFX},
-    };
-    for (const auto& entry : kTechnologies) {
-        if (name == entry.name) {
-            return std::string(entry.constant);
-        }
-    }
-    return std::string();
-}
 
 namespace {
 
@@ -52,14 +33,16 @@ CommandLine decodeCommandLine(DecodeOptions& options) {
          .value = "T",
          .help = "gsm (GSM/UMTS), lte, utran, cdma (CDMA2000) or ifx (object-based GSM)",
          .apply = [&options](std::string_view value) -> std::string {
-             if (technologyConstantFor(std::string(value)).empty()) {
-                 return "unknown technology '" + std::string(value) +
-                        "' (expected gsm, lte, utran, cdma or ifx)";
+             const TechnologyName* found = technologyNamed(value);
+             if (found == nullptr) {
+                 return "unknown technology '" + std::string(value) + "' (expected " +
+                        technologyNameList(", ", " or ") + ")";
              }
              options.technology = value;
+             options.technologyConstant = found->constant;
              return "";
          },
-         .synopsis = "--technology {gsm|lte|utran|cdma|ifx}"},
+         .synopsis = "--technology {" + technologyNameList("|", "|") + "}"},
         {.name = "--format",
          .value = "F",
          .help = "input format; auto (default) decides by file extension, then by content: hex (one blob per "
@@ -126,7 +109,7 @@ std::optional<DecodeOptions> parseDecodeOptions(const std::vector<std::string>& 
         return std::nullopt;
     }
     if (options.technology.empty()) {
-        error = "--technology is required (gsm, lte, utran, cdma or ifx)";
+        error = "--technology is required (" + technologyNameList(", ", " or ") + ")";
         return std::nullopt;
     }
     if (options.files.empty() && !options.startCommand) {

@@ -3,6 +3,7 @@
 
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "logfile/LogFormat.h"
@@ -12,7 +13,8 @@ namespace velmar {
 struct DecodeOptions {
     enum class Output { Display, State };
 
-    std::string technology;  // gsm, lte, utran, cdma or ifx
+    std::string technology;               // the short name: gsm, lte, utran, cdma or ifx
+    std::string_view technologyConstant;  // the technology constant that the name stands for
     LogFormat format = LogFormat::Auto;
     Output output = Output::Display;
     bool everyTick = false;
@@ -27,9 +29,6 @@ struct DecodeOptions {
 // (core/platform/CommandLine.h); on a usage error answers nullopt and sets error to a one-line message.
 std::optional<DecodeOptions> parseDecodeOptions(const std::vector<std::string>& arguments,
                                                 std::string& error);
-
-// The technology constant for a command-line technology name, or empty when the name is unknown.
-std::string technologyConstantFor(const std::string& name);
 
 std::string decodeUsage();  // the --help text
 

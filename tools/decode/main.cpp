@@ -67,7 +67,7 @@ void reportCaptureStatistics(const std::string& path, const LogReadStats& stats)
 int run(const DecodeOptions& options) {
     JsonOutput json(options.logStderr);
     std::unique_ptr<LogGenerator> generator =
-        LogGenerator::generatorFromTechnology(technologyConstantFor(options.technology));
+        LogGenerator::generatorFromTechnology(options.technologyConstant);
     if (!generator) {
         return fail("technology '" + options.technology + "' has no generator in this build");
     }
