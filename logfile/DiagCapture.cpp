@@ -2,6 +2,7 @@
 
 #include <array>
 
+#include "core/platform/WholeFile.h"
 #include "logfile/DiagStreamDeframer.h"
 
 namespace velmar {
@@ -49,7 +50,8 @@ LogReadResult parseDiagCaptureBytes(std::span<const std::uint8_t> bytes, const s
 bool forEachDiagCaptureItem(const std::string& path, const LogItemCallback& callback, std::string& error,
                             LogReadStats* stats) {
     PlistData bytes;
-    if (!readFileBytes(path, bytes, error)) {
+    if (const FileOutcome read = readWholeFile(path, bytes); !read.ok()) {
+        error = read.message(path);
         return false;
     }
     return scanDiagCaptureBytes(bytes, path, callback, error, stats);

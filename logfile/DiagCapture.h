@@ -23,7 +23,7 @@
 #include <string>
 
 #include "logfile/LogItem.h"
-#include "logfile/LogReadError.h"
+#include "logfile/LogReadResult.h"
 
 namespace velmar {
 

@@ -1,12 +1,11 @@
 #include "logfile/DlfFile.h"
 
-#include <cerrno>
-#include <cstdio>
 #include <cstring>
 
 #include "core/platform/BasebandPacket.h"
 #include "core/platform/RecordReader.h"
 #include "core/platform/RecordWriter.h"
+#include "core/platform/WholeFile.h"
 
 namespace velmar {
 
@@ -59,7 +58,8 @@ LogReadResult parseDlfBytes(std::span<const std::uint8_t> bytes, const std::stri
 bool forEachDlfItem(const std::string& path, const LogItemCallback& callback, std::string& error,
                     LogReadStats* stats) {
     PlistData bytes;
-    if (!readFileBytes(path, bytes, error)) {
+    if (const FileOutcome read = readWholeFile(path, bytes); !read.ok()) {
+        error = read.message(path);
         return false;
     }
     return scanDlfBytes(bytes, path, callback, error, stats);
@@ -83,15 +83,8 @@ bool appendDlfRecord(PlistData& out, std::uint16_t code, std::uint64_t timestamp
 }
 
 bool appendToDlfFile(const std::string& path, std::span<const std::uint8_t> records, std::string& error) {
-    std::FILE* file = std::fopen(path.c_str(), "ab");
-    if (file == nullptr) {
-        error = path + ": cannot open for appending: " + std::strerror(errno);
-        return false;
-    }
-    const bool written = std::fwrite(records.data(), 1, records.size(), file) == records.size();
-    const int writeErrno = errno;
-    if (std::fclose(file) != 0 || !written) {
-        error = path + ": cannot write: " + std::strerror(written ? errno : writeErrno);
+    if (const FileOutcome written = writeWholeFile(path, records, FileWrite::Append); !written.ok()) {
+        error = written.message(path);
         return false;
     }
     return true;

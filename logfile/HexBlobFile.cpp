@@ -1,8 +1,9 @@
 #include "logfile/HexBlobFile.h"
 
-#include <cerrno>
 #include <cstdio>
 #include <cstring>
+
+#include "core/platform/WholeFile.h"
 
 namespace velmar {
 
@@ -131,7 +132,8 @@ LogReadResult parseHexBlobText(std::string_view text, const std::string& name) {
 bool forEachHexBlobItem(const std::string& path, const LogItemCallback& callback, std::string& error,
                         LogReadStats* stats) {
     PlistData bytes;
-    if (!readFileBytes(path, bytes, error)) {
+    if (const FileOutcome read = readWholeFile(path, bytes); !read.ok()) {
+        error = read.message(path);
         return false;
     }
     const std::string_view text(reinterpret_cast<const char*>(bytes.data()), bytes.size());
@@ -175,15 +177,9 @@ std::string formatHexBlobText(std::span<const LogItem> items, std::string_view c
 bool writeHexBlobFile(const std::string& path, std::span<const LogItem> items, std::string& error,
                       std::string_view comment) {
     const std::string text = formatHexBlobText(items, comment);
-    std::FILE* file = std::fopen(path.c_str(), "wb");
-    if (file == nullptr) {
-        error = path + ": cannot create: " + std::strerror(errno);
-        return false;
-    }
-    const bool written = std::fwrite(text.data(), 1, text.size(), file) == text.size();
-    const int writeErrno = errno;
-    if (std::fclose(file) != 0 || !written) {
-        error = path + ": cannot write: " + std::strerror(written ? errno : writeErrno);
+    const ByteView bytes(reinterpret_cast<const std::uint8_t*>(text.data()), text.size());
+    if (const FileOutcome written = writeWholeFile(path, bytes); !written.ok()) {
+        error = written.message(path);
         return false;
     }
     return true;

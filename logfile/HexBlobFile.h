@@ -12,7 +12,7 @@
 #include <string_view>
 
 #include "logfile/LogItem.h"
-#include "logfile/LogReadError.h"
+#include "logfile/LogReadResult.h"
 
 namespace velmar {
 

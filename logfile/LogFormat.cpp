@@ -6,6 +6,7 @@
 #include <cstring>
 
 #include "core/platform/RecordReader.h"
+#include "core/platform/WholeFile.h"
 #include "logfile/DiagCapture.h"
 #include "logfile/DlfFile.h"
 #include "logfile/HexBlobFile.h"
@@ -148,7 +149,8 @@ std::optional<LogFormat> detectLogFormat(const std::string& path, std::string& e
         return format;
     }
     PlistData head;
-    if (!readFileBytes(path, head, error, kLogFormatProbeSize)) {
+    if (const FileOutcome read = readWholeFile(path, head, kLogFormatProbeSize); !read.ok()) {
+        error = read.message(path);
         return std::nullopt;
     }
     return logFormatForContent(head);

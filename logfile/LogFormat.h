@@ -14,7 +14,7 @@
 #include <string_view>
 
 #include "logfile/LogItem.h"
-#include "logfile/LogReadError.h"
+#include "logfile/LogReadResult.h"
 
 namespace velmar {
 
@@ -34,7 +34,7 @@ LogFormat logFormatForContent(std::span<const std::uint8_t> head);
 // The extension's format, else the content's; nullopt with a message when the file cannot be read.
 std::optional<LogFormat> detectLogFormat(const std::string& path, std::string& error);
 
-// Reads path with the reader of format (detected first when Auto); see LogReadError.h for the two forms.
+// Reads path with the reader of format (detected first when Auto); see LogReadResult.h for the two forms.
 bool forEachLogItem(const std::string& path, LogFormat format, const LogItemCallback& callback,
                     std::string& error, LogReadStats* stats = nullptr);
 LogReadResult readLogFile(const std::string& path, LogFormat format = LogFormat::Auto);

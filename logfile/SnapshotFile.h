@@ -20,7 +20,7 @@
 
 #include "core/platform/plist/PlistValue.h"
 #include "logfile/LogItem.h"
-#include "logfile/LogReadError.h"
+#include "logfile/LogReadResult.h"
 
 namespace velmar {
 

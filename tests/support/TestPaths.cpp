@@ -2,12 +2,15 @@
 
 #include <cstdlib>
 #include <filesystem>
-#include <fstream>
-#include <sstream>
+#include <vector>
+
+#include "core/platform/WholeFile.h"
 
 namespace velmar::testing {
 
-std::string testDataPath(const std::string& name) { return std::string(VELMAR_TEST_DATA_DIR) + "/" + name; }
+std::string testDataPath(const std::string& name) {
+    return std::string(VELMAR_TEST_DATA_DIR) + "/" + name;
+}
 
 TemporaryDirectory::TemporaryDirectory() {
     std::string pattern = (std::filesystem::temp_directory_path() / "velmar-test-XXXXXX").string();
@@ -24,15 +27,14 @@ TemporaryDirectory::~TemporaryDirectory() {
 }
 
 std::string readWholeFile(const std::string& path) {
-    std::ifstream in(path, std::ifstream::binary);
-    std::ostringstream out;
-    out << in.rdbuf();
-    return out.str();
+    std::vector<std::uint8_t> bytes;
+    velmar::readWholeFile(path, bytes);
+    return std::string(bytes.begin(), bytes.end());
 }
 
 void writeWholeFile(const std::string& path, const std::string& contents) {
-    std::ofstream out(path, std::ofstream::binary | std::ofstream::trunc);
-    out << contents;
+    velmar::writeWholeFile(path,
+                           ByteView(reinterpret_cast<const std::uint8_t*>(contents.data()), contents.size()));
 }
 
 }  // namespace velmar::testing

@@ -1,11 +1,10 @@
 // parsePropertyList (choosing the reader by the document's first bytes) and readDictionaryFile.
-#include <cerrno>
-#include <cstdio>
 #include <cstring>
 #include <optional>
 #include <span>
 #include <string>
 
+#include "core/platform/WholeFile.h"
 #include "core/platform/plist/PlistCodec.h"
 
 namespace velmar {
@@ -21,27 +20,6 @@ namespace {
 constexpr char kBinaryMagic[] = "bplist00";
 constexpr std::size_t kBinaryMagicSize = sizeof kBinaryMagic - 1;
 
-bool readFile(const std::string& path, PlistData& contents, std::string& problem) {
-    std::FILE* file = std::fopen(path.c_str(), "rb");
-    if (file == nullptr) {
-        problem = std::strerror(errno);
-        return false;
-    }
-    contents.clear();
-    std::uint8_t chunk[65536];
-    std::size_t got = 0;
-    while ((got = std::fread(chunk, 1, sizeof chunk, file)) > 0) {
-        contents.insert(contents.end(), chunk, chunk + got);
-    }
-    const bool failed = std::ferror(file) != 0;
-    std::fclose(file);
-    if (failed) {
-        problem = "read error";
-        return false;
-    }
-    return true;
-}
-
 }  // namespace
 
 std::optional<PlistValue> parsePropertyList(std::span<const std::uint8_t> bytes, std::string* error) {
@@ -53,13 +31,13 @@ std::optional<PlistValue> parsePropertyList(std::span<const std::uint8_t> bytes,
 
 std::optional<PlistValue> readDictionaryFile(const std::string& path, std::string* error) {
     PlistData contents;
-    std::string problem;
-    if (!readFile(path, contents, problem)) {
+    if (const FileOutcome read = readWholeFile(path, contents); !read.ok()) {
         if (error != nullptr) {
-            *error = path + ": " + problem;
+            *error = path + ": " + read.reason();
         }
         return std::nullopt;
     }
+    std::string problem;
     auto value = parsePropertyList(contents, &problem);
     if (!value) {
         if (error != nullptr) {

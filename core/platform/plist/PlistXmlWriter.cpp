@@ -12,11 +12,11 @@
 #include <algorithm>
 #include <array>
 #include <charconv>
-#include <cstdio>
 #include <span>
 #include <string>
 #include <string_view>
 
+#include "core/platform/WholeFile.h"
 #include "core/platform/plist/Base64.h"
 #include "core/platform/plist/Iso8601.h"
 #include "core/platform/plist/PlistCodec.h"
@@ -260,13 +260,7 @@ bool writeXmlFile(const PlistValue& dictionary, const std::string& path) {
     if (!document) {
         return false;
     }
-    std::FILE* file = std::fopen(path.c_str(), "wb");
-    if (file == nullptr) {
-        return false;
-    }
-    const bool written = std::fwrite(document->data(), 1, document->size(), file) == document->size();
-    const bool closed = std::fclose(file) == 0;
-    return written && closed;
+    return writeWholeFile(path, *document).ok();
 }
 
 }  // namespace velmar
