@@ -33,6 +33,7 @@
 #include "core/platform/TelephonyServiceConnection.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/LogFormat.h"
+#include "tests/support/ProcessCpu.h"
 
 namespace velmar {
 namespace {
@@ -70,28 +71,6 @@ const Capture& capture() {
         return result;
     }();
     return loaded;
-}
-
-double processSeconds(pid_t pid) {
-    std::ifstream in("/proc/" + std::to_string(pid) + "/stat");
-    std::string text((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-    const std::size_t close = text.rfind(')');
-    if (close == std::string::npos) {
-        return 0;
-    }
-    std::istringstream fields(text.substr(close + 2));
-    std::string field;
-    unsigned long long utime = 0;
-    unsigned long long stime = 0;
-    for (int index = 3; fields >> field; ++index) {  // field 3 is the state
-        if (index == 14) {
-            utime = std::stoull(field);
-        } else if (index == 15) {
-            stime = std::stoull(field);
-            break;
-        }
-    }
-    return static_cast<double>(utime + stime) / static_cast<double>(sysconf(_SC_CLK_TCK));
 }
 
 double ownCpuSeconds() {
@@ -233,7 +212,7 @@ void BM_ServiceFastReplay(benchmark::State& state) {
             if (state.error_occurred()) {
                 break;
             }
-            const double serviceBefore = processSeconds(service.pid());
+            const double serviceBefore = testing::processCpuSeconds(service.pid());
             const double clientBefore = ownCpuSeconds();
             const auto started = Clock::now();
             for (const auto& client : clients) {
@@ -259,7 +238,7 @@ void BM_ServiceFastReplay(benchmark::State& state) {
                 }
             }
             const double elapsed = std::chrono::duration<double>(lastArrival - started).count();
-            serviceCpu += processSeconds(service.pid()) - serviceBefore;
+            serviceCpu += testing::processCpuSeconds(service.pid()) - serviceBefore;
             clientCpu += ownCpuSeconds() - clientBefore;
             received += static_cast<double>(total);
             missed += static_cast<double>(perClient * clients.size() - total);

@@ -4,11 +4,9 @@
 #include <cstdio>
 #include <cstring>
 
-#include "core/platform/BasebandPacket.h"
 #include "core/platform/RecordReader.h"
 #include "core/platform/SystemLog.h"
-#include "logfile/DiagCapture.h"
-#include "logfile/DlfFile.h"
+#include "logfile/DiagFraming.h"
 
 namespace velmar {
 
@@ -29,6 +27,9 @@ const std::string& overlongReason() {
 
 DiagStreamDeframer::DiagStreamDeframer(std::string name, LogItemCallback callback, LogReadStats* stats)
     : name_(std::move(name)), callback_(std::move(callback)), stats_(stats != nullptr ? stats : &ownStats_) {}
+
+DiagStreamDeframer::DiagStreamDeframer(std::string name, DiagFrameSink& frames, LogReadStats* stats)
+    : name_(std::move(name)), frames_(&frames), stats_(stats != nullptr ? stats : &ownStats_) {}
 
 void DiagStreamDeframer::feed(std::span<const std::uint8_t> bytes) {
     const std::uint8_t* const data = bytes.data();
@@ -82,6 +83,10 @@ void DiagStreamDeframer::finish() {
     }
     pending_.clear();
     overlong_ = false;
+    reportSkipped();
+}
+
+void DiagStreamDeframer::reportSkipped() {
     if (badHere_ > kMaxReportedProblems) {
         const std::uint64_t unreported = badHere_ - kMaxReportedProblems;
         SystemLog::log(kLogWarning, "%s: %" PRIu64 " more bad frames skipped", name_.c_str(), unreported);
@@ -116,7 +121,7 @@ void DiagStreamDeframer::frame(std::uint64_t offset, const std::uint8_t* escaped
         bad(offset, "CRC " + hex16(sent) + " does not match the computed " + hex16(computed));
         return;
     }
-    handle(offset, length - 2);
+    handle(offset, std::span(escaped, size), length - 2);
 }
 
 // Copies the escaped bytes into frame_ without their escapes; false on an escape with nothing after it.
@@ -146,56 +151,34 @@ bool DiagStreamDeframer::unescape(const std::uint8_t* in, std::size_t size, std:
     return true;
 }
 
-// Classifies the checked frame frame_[0, length), length >= 1, that starts at offset in the input. Every
-// unwrapping step leaves at least one byte, so the loop never looks past the frame.
-void DiagStreamDeframer::handle(std::uint64_t offset, std::size_t length) {
-    std::size_t first = 0;
-    int depth = 0;
-    while (frame_[first] == kDiagWrapper) {
-        if (length - first < 2 || frame_[first + 1] != 0x01) {
-            break;  // a wrapper version this reader does not know: an "other" frame
+// Hands on the checked frame frame_[0, length), length >= 1, that starts at offset in the input.
+void DiagStreamDeframer::handle(std::uint64_t offset, std::span<const std::uint8_t> escaped,
+                                std::size_t length) {
+    const std::span<std::uint8_t> payload(frame_.data(), length);
+    if (frames_ != nullptr) {
+        if (!frames_->onDiagFrame(DiagFrameView{offset, escaped, payload})) {
+            stopped_ = true;
         }
-        if (depth == kMaxDiagWrapperDepth) {
-            bad(offset, "wrappers nested deeper than " + std::to_string(kMaxDiagWrapperDepth) + " levels");
-            return;
-        }
-        if (length - first <= kDiagWrapperHeaderSize) {
-            bad(offset, "wrapper of " + std::to_string(length - first) + " bytes holds no frame");
-            return;
-        }
-        first += kDiagWrapperHeaderSize;
-        ++depth;
+        return;
     }
-    if (depth > 0) {
+    const DiagFrameContents contents = readDiagFrame(payload);
+    if (contents.subscription) {
         ++stats_->wrappedFrames;
     }
-    const std::size_t size = length - first;
-    std::uint8_t* const packet = frame_.data() + first;
-    if (packet[0] != kDiagLogPacket) {
-        ++stats_->otherFrames;
-        return;
-    }
-    if (size < 6) {
-        bad(offset, "log packet of " + std::to_string(size) + " bytes is too short for a record length");
-        return;
-    }
-    const std::size_t recordLength = RecordReader(ByteView(packet, size)).u16(4);
-    if (recordLength < kDlfHeaderSize) {
-        bad(offset, "record length " + std::to_string(recordLength) + " is shorter than the " +
-                        std::to_string(kDlfHeaderSize) + "-byte header");
-        return;
-    }
-    if (4 + recordLength > size) {
-        bad(offset, "record length " + std::to_string(recordLength) + " runs past the end of the " +
-                        std::to_string(size) + "-byte log packet");
-        return;
+    switch (contents.kind) {
+        case DiagFrameContents::Kind::Bad:
+            bad(offset, contents.problem);
+            return;
+        case DiagFrameContents::Kind::Other:
+            ++stats_->otherFrames;
+            return;
+        case DiagFrameContents::Kind::LogPacket:
+            break;
     }
     ++stats_->logPackets;
     ++stats_->blobs;
-    // The byte before the record becomes the blob's type byte, so the blob needs no copy.
-    packet[3] = kPlainLogType;
     LogItemView item;
-    item.bytes = std::span<const std::uint8_t>(packet + 3, 1 + recordLength);
+    item.bytes = contents.blob;
     item.offset = offset;
     if (!callback_(item)) {
         stopped_ = true;

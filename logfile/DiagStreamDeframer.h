@@ -1,13 +1,16 @@
 // DiagStreamDeframer: cuts a diagnostic-port byte stream into frames as it arrives, in chunks of any size,
-// and hands out the log packets it finds. The capture file reader is this deframer fed once with the whole
-// file, so a live port and a recorded capture are framed by the same code.
+// and checks them. The capture file reader is this deframer fed once with the whole file, so a live port and
+// a recorded capture are framed by the same code.
 //
-// Contract (the framing and frame kinds are described in DiagCapture.h):
+// Contract (the framing and frame kinds are described in DiagFraming.h):
 // - feed() takes the next bytes of the stream; a frame cut between two chunks is completed by the next one.
-//   Feeding a stream whole or in any chunking gives the same items, offsets, counters and messages.
-// - Each blob goes to the callback as it is found; its bytes are valid only during the call and its offset
-//   is where its frame starts in the stream (bytes fed so far). The callback returning false stops the
-//   deframer: later bytes are ignored.
+//   Feeding a stream whole or in any chunking gives the same frames, items, offsets, counters and messages.
+// - Frame mode (a DiagFrameSink): every frame whose CRC checks goes to the sink, unescaped and without its
+//   CRC, with its bytes as received; the sink interprets it (readDiagFrame) and may report it bad().
+// - Log-packet mode (a LogItemCallback): each log packet's blob goes to the callback; other frames are
+//   counted as "other" and damaged ones as bad.
+// - Bytes handed out are valid only during the call; an offset is where the frame starts in the stream
+//   (bytes fed so far). A sink or callback returning false stops the deframer: later bytes are ignored.
 // - A frame longer than kMaxDiagFrameBytes (escaped) is bad and skipped up to its 0x7E, so a stream that
 //   never ends a frame cannot make the deframer hold more than that.
 // - finish() ends one input: bytes after the last 0x7E are a bad frame, and the bad frames beyond the first
@@ -25,6 +28,20 @@
 
 namespace velmar {
 
+// One frame whose CRC checked.
+struct DiagFrameView {
+    std::uint64_t offset = 0;
+    std::span<const std::uint8_t> escaped;  // the frame as received, without its closing 0x7E
+    std::span<std::uint8_t> payload;        // escapes undone, CRC removed; at least one byte; writable
+};
+
+class DiagFrameSink {
+  public:
+    virtual ~DiagFrameSink() = default;
+    // false stops the deframer.
+    virtual bool onDiagFrame(const DiagFrameView& frame) = 0;
+};
+
 // The longest frame, escaped, that a deframer accepts: a 64 KiB record with every byte escaped and room
 // for the packet and wrapper headers.
 inline constexpr std::size_t kMaxDiagFrameBytes = 256 * 1024;
@@ -33,23 +50,32 @@ class DiagStreamDeframer {
   public:
     // name is used in messages; stats (may be null) receives the frame counters and problems.
     DiagStreamDeframer(std::string name, LogItemCallback callback, LogReadStats* stats = nullptr);
+    DiagStreamDeframer(std::string name, DiagFrameSink& frames, LogReadStats* stats = nullptr);
 
     void feed(std::span<const std::uint8_t> bytes);
+    // Sums up the bad frames beyond the first few described since the last summary, in one warning, and
+    // describes the next few again: a stream that never ends reports its damage this way.
+    void reportSkipped();
+    // The name in later messages (a live source's next port).
+    void setName(std::string name) { name_ = std::move(name); }
     void finish();
 
     bool stopped() const { return stopped_; }
     // Bytes fed so far.
     std::uint64_t consumed() const { return consumed_; }
     const LogReadStats& stats() const { return *stats_; }
+    // Counts a frame found bad (by the deframer, or by a frame sink that read it); the first few of this
+    // input are also described and logged as warnings.
+    void bad(std::uint64_t offset, const std::string& reason);
 
   private:
     void frame(std::uint64_t offset, const std::uint8_t* escaped, std::size_t size);
     bool unescape(const std::uint8_t* in, std::size_t size, std::size_t& length);
-    void handle(std::uint64_t offset, std::size_t length);
-    void bad(std::uint64_t offset, const std::string& reason);
+    void handle(std::uint64_t offset, std::span<const std::uint8_t> escaped, std::size_t length);
 
     std::string name_;
     LogItemCallback callback_;
+    DiagFrameSink* frames_ = nullptr;
     LogReadStats ownStats_;
     LogReadStats* stats_;
     PlistData frame_;    // the current frame, unescaped; grows to the largest frame

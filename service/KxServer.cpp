@@ -53,6 +53,7 @@ KxServer::OpenResult KxServer::open() {
 void KxServer::shutdown() {
     *alive_ = false;
     ready_ = nullptr;
+    demandObserver_ = nullptr;
     // The list is emptied first, so that nothing walks it while the channels end.
     const std::vector<std::shared_ptr<LogChannel>> channels = std::move(channels_);
     channels_.clear();
@@ -149,7 +150,43 @@ void KxServer::wakeSource() {
     ready_ = nullptr;
 }
 
+LogCodeFilter KxServer::streamingDemand() const {
+    LogCodeFilter demand;
+    for (const std::shared_ptr<LogChannel>& channel : channels_) {
+        if (channel->streaming()) {
+            demand.unite(channel->filter());
+        }
+    }
+    return demand;
+}
+
+void KxServer::observeStreamingDemand(std::function<void()> changed) {
+    demandObserver_ = std::move(changed);
+}
+
+void KxServer::channelStreamingChanged(LogChannel& /*channel*/) {
+    demandChanged();
+}
+
+void KxServer::demandChanged() {
+    if (demandNoticeQueued_ || !demandObserver_) {
+        return;
+    }
+    demandNoticeQueued_ = true;
+    queue_.async([this, alive = std::weak_ptr<bool>(alive_)] {
+        const std::shared_ptr<bool> live = alive.lock();
+        if (!live || !*live) {
+            return;
+        }
+        demandNoticeQueued_ = false;
+        if (demandObserver_) {
+            demandObserver_();
+        }
+    });
+}
+
 void KxServer::channelEnded(LogChannel& /*channel*/) {
+    demandChanged();
     if (pruneQueued_) {
         return;
     }

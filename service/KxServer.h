@@ -7,6 +7,8 @@
 // - {"Request": "CreateLogChannel", "ReceivePort": name} creates a channel (LogChannel) streaming to that
 //   port, listening on "com.velmar.kxserver.channel.<pid>.<n>", and answers {"Domain": 1, "Error": 0,
 //   "ChannelPort": name}. Anything else is answered with a non-zero Error and a Reason, and logged.
+// - streamingDemand() is the union of the streaming channels' filters; the demand observer hears of every
+//   change of it on the queue (coalesced within one queue turn).
 // - deliver() offers each blob to every channel. canTakeMore() holds when some streaming channel keeps up
 //   and none is behind with a client still reading: a source that is not paced by time goes at the pace of
 //   the slowest live client, while a stalled client only loses its own oldest blobs.
@@ -44,6 +46,8 @@ class KxServer : public BlobSink, private LogChannel::Listener {
     void deliver(const BasebandBlob& blob) override;
     bool canTakeMore() const override;
     void notifyWhenReady(std::function<void()> ready) override;
+    LogCodeFilter streamingDemand() const override;
+    void observeStreamingDemand(std::function<void()> changed) override;
 
     std::size_t channelCount() const { return channels_.size(); }
 
@@ -51,7 +55,10 @@ class KxServer : public BlobSink, private LogChannel::Listener {
     std::optional<PlistData> onControlMessage(ByteView data);
     PlistData reject(std::int32_t error, const std::string& reason);
     void channelReady(LogChannel& channel) override;
+    void channelStreamingChanged(LogChannel& channel) override;
     void channelEnded(LogChannel& channel) override;
+    // Tells the demand observer, once per queue turn however many channels changed.
+    void demandChanged();
     // Resumes a source that waits for the channels to take more.
     void wakeSource();
 
@@ -62,7 +69,9 @@ class KxServer : public BlobSink, private LogChannel::Listener {
     std::vector<std::shared_ptr<LogChannel>> channels_;
     unsigned nextChannelId_ = 1;
     std::function<void()> ready_;
+    std::function<void()> demandObserver_;
     bool pruneQueued_ = false;
+    bool demandNoticeQueued_ = false;
     std::shared_ptr<bool> alive_;
 };
 

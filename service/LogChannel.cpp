@@ -105,6 +105,7 @@ void LogChannel::onStateCommand(const PlistDictionary& command, const std::strin
         queued_.clear();
         SystemLog::log(kLogNotice, "channel %u: stopped streaming (SetState %s)", id(),
                        quotedForLog(state).c_str());
+        listener_.channelStreamingChanged(*this);
         return;
     }
     if (settings_.objectBased) {
@@ -128,6 +129,7 @@ void LogChannel::onStateCommand(const PlistDictionary& command, const std::strin
         }
     }
     streaming_ = true;
+    listener_.channelStreamingChanged(*this);
     listener_.channelReady(*this);
 }
 

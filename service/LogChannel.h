@@ -42,6 +42,8 @@ class LogChannel : public std::enable_shared_from_this<LogChannel> {
         // The channel may take more now: it has started streaming, its queue is short again, or its client
         // has stalled and no longer holds a paced source back.
         virtual void channelReady(LogChannel& channel) = 0;
+        // The channel started or stopped streaming, or its filter changed.
+        virtual void channelStreamingChanged(LogChannel& channel) = 0;
         virtual void channelEnded(LogChannel& channel) = 0;
     };
 
@@ -84,6 +86,7 @@ class LogChannel : public std::enable_shared_from_this<LogChannel> {
     unsigned id() const { return settings_.id; }
     const std::string& channelPortName() const { return settings_.channelPortName; }
     bool streaming() const { return streaming_; }
+    const LogCodeFilter& filter() const { return filter_; }
     bool ended() const { return ended_; }
     std::size_t queued() const { return queued_.size(); }
     std::uint64_t sent() const { return sent_; }

@@ -34,6 +34,12 @@ class LogCodeFilter {
 
     void addCode(std::uint16_t code) { codes_.set(code); }
     void addExtraCode(std::uint16_t code) { extraCodes_.set(code); }
+    // Takes, from now on, whatever other takes too.
+    void unite(const LogCodeFilter& other) {
+        all_ = all_ || other.all_;
+        codes_ |= other.codes_;
+        extraCodes_ |= other.extraCodes_;
+    }
 
     bool accepts(const BasebandBlob& blob) const {
         switch (blob.kind) {
@@ -48,6 +54,8 @@ class LogCodeFilter {
     }
 
     bool takesEverything() const { return all_; }
+    bool operator==(const LogCodeFilter&) const = default;
+    const std::bitset<kCodeCount>& codes() const { return codes_; }
     std::size_t codeCount() const { return codes_.count(); }
     std::size_t extraCodeCount() const { return extraCodes_.count(); }
 

@@ -14,6 +14,7 @@
 #include "service/KxServer.h"
 #include "service/ServiceOptions.h"
 #include "service/SourceFactory.h"
+#include "service/live/PortListing.h"
 
 namespace velmar {
 
@@ -22,6 +23,8 @@ namespace {
 constexpr const char* kProgramName = "kxserverd";
 constexpr int kExitCannotStart = 1;
 constexpr int kExitUsage = 2;
+// How long a source may take to finish (a modem's stop sequence) after SIGTERM or SIGINT.
+constexpr double kFinishSeconds = 5.0;
 
 int cannotStart(const std::string& message) {
     std::fprintf(stderr, "%s: %s\n", kProgramName, message.c_str());
@@ -58,6 +61,13 @@ int runKxServerd(int argc, char** argv) {
     SystemLog::configureFromEnvironment(kProgramName);
     SystemLog::setMirrorToStderr(options.logStderr);
     std::signal(SIGPIPE, SIG_IGN);
+    // A recording that reaches a file-size limit fails its write (and stops) instead of ending the service.
+    std::signal(SIGXFSZ, SIG_IGN);
+    if (options.listDevices) {
+        const LiveSource::Settings live = liveSettings(options);
+        live::listDiagnosticPorts(live.deviceRoot, live.timing, stdout);
+        return 0;
+    }
 
     std::string error;
     const std::unique_ptr<BasebandSource> source = makeBasebandSource(options, error);
@@ -88,16 +98,34 @@ int runKxServerd(int argc, char** argv) {
         close(signals);
         return cannotStart(error);
     }
+    std::string failure;
+    source->setFailureHandler([&](const std::string& reason) {
+        if (failure.empty()) {
+            failure = reason;
+            queue.stop();
+        }
+    });
 
     int stoppedBy = 0;
+    bool finishing = false;
     const MainQueue::Handle signalWatch = queue.watchReadable(signals, [&] {
         signalfd_siginfo info{};
         while (read(signals, &info, sizeof info) == static_cast<ssize_t>(sizeof info)) {
             stoppedBy = static_cast<int>(info.ssi_signo);
         }
-        if (stoppedBy != 0) {
-            queue.stop();
+        if (stoppedBy == 0) {
+            return;
         }
+        if (finishing) {
+            queue.stop();  // a second signal does not wait for the source
+            return;
+        }
+        // The source may have something to tell its device first (a modem: logging off); it gets a bounded
+        // time for it, while the channels go on.
+        finishing = true;
+        SystemLog::log(kLogNotice, "kxserverd: stopping on signal %d", stoppedBy);
+        queue.after(kFinishSeconds, [&queue] { queue.stop(); });
+        source->finish([&queue] { queue.stop(); });
     });
     SystemLog::log(kLogNotice, "kxserverd: serving %s on port %s; source: %s",
                    std::string(options.technology).c_str(), std::string(kKxServerControlPortName).c_str(),
@@ -105,12 +133,16 @@ int runKxServerd(int argc, char** argv) {
     source->start(queue, server);
     queue.run();
 
-    SystemLog::log(kLogNotice, "kxserverd: stopping on signal %d", stoppedBy);
     source->stop();
     server.shutdown();
     queue.unwatch(signalWatch);
     close(signals);
     MainQueue::setCurrent(nullptr);
+    if (!failure.empty()) {
+        std::fprintf(stderr, "%s: %s\n", kProgramName, failure.c_str());
+        SystemLog::log(kLogError, "%s", failure.c_str());
+        return kExitCannotStart;
+    }
     return 0;
 }
 

@@ -32,9 +32,11 @@ struct OptionScope {
     bool live;
 };
 
-constexpr std::array<OptionScope, 8> kScopes = {{
+constexpr std::array<OptionScope, 10> kScopes = {{
     {"--input", false, true, false},
     {"--device", false, false, true},
+    {"--subscription", false, false, true},
+    {"--record", false, false, true},
     {"--speed", false, true, false},
     {"--fast", false, true, false},
     {"--loop", false, true, false},
@@ -84,7 +86,7 @@ std::optional<double> parsePositiveNumber(std::string_view given) {
     return value;
 }
 
-std::optional<std::uint64_t> parseSeed(std::string_view given) {
+std::optional<std::uint64_t> parseUnsigned(std::string_view given) {
     const std::string text(given);
     if (text.empty() || text.find_first_not_of("0123456789") != std::string::npos) {
         return std::nullopt;
@@ -111,7 +113,7 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
         .epilogue =
             "SIGTERM or SIGINT closes every channel and the control port and exits with status 0. Exit "
             "status 1: the service could not start (another kxserverd is already running, unreadable "
-            "input, device that cannot be opened); 2: usage error.",
+            "input, device that cannot be opened or does not answer a version request); 2: usage error.",
     };
     commandLine.options = {
         {.name = "--source",
@@ -177,7 +179,7 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
          .help = "sim: seed of the simulated baseband (default 1); the same seed gives the same cells, route "
                  "and events",
          .apply = [&options](std::string_view value) -> std::string {
-             const std::optional<std::uint64_t> seed = parseSeed(value);
+             const std::optional<std::uint64_t> seed = parseUnsigned(value);
              if (!seed) {
                  return "--seed needs a non-negative integer, not " + quoted(value);
              }
@@ -185,9 +187,16 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
              return "";
          }},
         {.name = "--device",
-         .value = "PATH",
-         .help = "live: the diagnostic port (character device or FIFO), read as a raw capture",
-         .apply = storesValue(options.device)},
+         .value = "PATH|auto",
+         .help =
+             "live: the modem's diagnostic port: a tty (/dev/ttyUSB0), a /dev/serial/by-id link, or a FIFO "
+             "fed with a raw capture (only read). The service probes the port, makes the modem log "
+             "exactly the codes that the streaming channels ask for, and turns logging off when it ends. "
+             "auto: the first USB serial port that answers, vendor-specific interfaces only. A port that "
+             "goes away (unplug, reset) or stops answering is looked for again every second, then probed "
+             "and set up again; the channels stay connected meanwhile",
+         .apply = storesValue(options.device),
+         .synopsis = "[--device PATH]"},
         logStderrOption(options.logStderr),
         {.name = "--scenario",
          .value = "NAME",
@@ -213,6 +222,31 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
              options.rateMultiplier = *rate;
              return "";
          }},
+        {.name = "--subscription",
+         .value = "N",
+         .help = "live: on a multi-SIM modem, the subscription (SIM) whose log packets stream (default: the "
+                 "lowest subscription id seen); the others are counted",
+         .apply = [&options](std::string_view value) -> std::string {
+             const std::optional<std::uint64_t> id = parseUnsigned(value);
+             if (!id || *id > 0xFFFFFFFFULL) {
+                 return "--subscription needs an integer from 0 to 4294967295, not " + quoted(value);
+             }
+             options.subscription = static_cast<std::uint32_t>(*id);
+             return "";
+         }},
+        {.name = "--record",
+         .value = "FILE",
+         .help =
+             "live: also write every frame from the port, as received, to FILE (a raw capture, mode 0600, "
+             "that --source replay and velmar-decode read)",
+         .apply = storesValue(options.record)},
+        {.name = "--list-devices",
+         .value = "",
+         .help = "probe the USB serial ports that may be a diagnostic port, print one line each (tty, by-id "
+                 "link, vendor:product, interface, \"answers\" or \"silent\") and exit; stop a running "
+                 "kxserverd first: one program per port",
+         .apply = setsFlag(options.listDevices),
+         .synopsis = "| --list-devices"},
     };
     return commandLine;
 }
@@ -255,6 +289,9 @@ ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& argumen
                             std::string(sourceName(options.source)));
             }
         }
+    }
+    if (options.listDevices) {
+        return parsed;
     }
     if (options.source == SourceKind::Replay && options.input.empty()) {
         return fail("--source replay needs --input FILE");

@@ -2,12 +2,14 @@
 //
 //   kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]
 //             [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
-//             [--scenario drive|walk|static] [--rate-multiplier X]
+//             [--scenario drive|walk|static] [--rate-multiplier X] [--subscription N]
+//             [--record FILE] | --list-devices
 //
 // Contract: parseServiceOptions reads the arguments after the program name with the one command-line parser
 // (core/platform/CommandLine.h: "--name value" or "--name=value", --help anywhere wins). It answers the
 // options, or help, or a one-line usage error: an unknown option or value, a missing value, a bad number,
 // --speed with --fast, a source without its input, or an option that does not apply to the chosen source.
+// --list-devices asks for the listing of diagnostic ports instead of a service: it needs no source.
 #pragma once
 
 #include <cstdint>
@@ -26,7 +28,10 @@ struct ServiceOptions {
     std::string_view technology;  // the "GetTechnology" answer
     bool objectBased = false;     // the technology's start command names no codes
     std::string input;
-    std::string device;
+    std::string device;                         // live: a path, or "auto"
+    std::optional<std::uint32_t> subscription;  // live: the streaming subscription; none: the lowest seen
+    std::string record;                         // live: the raw capture to write; empty: none
+    bool listDevices = false;
     double speed = 1.0;
     bool fast = false;
     bool loop = false;

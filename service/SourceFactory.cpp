@@ -1,7 +1,10 @@
 #include "service/SourceFactory.h"
 
-#include "service/LiveSource.h"
+#include <cstdlib>
+
 #include "service/ReplaySource.h"
+#include "service/live/DeviceDiscovery.h"
+#include "service/live/LiveSource.h"
 #include "service/sim/SimSource.h"
 
 namespace velmar {
@@ -18,7 +21,33 @@ sim::Scenario scenarioOf(std::string_view name) {
     return sim::Scenario::Drive;
 }
 
+// A positive number of seconds from the environment, or fallback. The live source's timing can be
+// shortened this way so that tests of silent and vanishing devices run quickly.
+double secondsFromEnvironment(const char* name, double fallback) {
+    const char* text = std::getenv(name);
+    if (text == nullptr || *text == '\0') {
+        return fallback;
+    }
+    char* end = nullptr;
+    const double value = std::strtod(text, &end);
+    return (*end == '\0' && value > 0 && value <= 3600) ? value : fallback;
+}
+
 }  // namespace
+
+LiveSource::Settings liveSettings(const ServiceOptions& options) {
+    LiveSource::Settings settings;
+    settings.device = options.device;
+    settings.subscription = options.subscription;
+    settings.recordPath = options.record;
+    settings.timing.responseSeconds =
+        secondsFromEnvironment("VELMAR_DIAG_RESPONSE_SECONDS", settings.timing.responseSeconds);
+    settings.timing.keepAliveSeconds =
+        secondsFromEnvironment("VELMAR_DIAG_KEEPALIVE_SECONDS", settings.timing.keepAliveSeconds);
+    settings.retrySeconds = secondsFromEnvironment("VELMAR_DIAG_RETRY_SECONDS", settings.retrySeconds);
+    settings.deviceRoot = live::deviceRoot();
+    return settings;
+}
 
 std::unique_ptr<BasebandSource> makeBasebandSource(const ServiceOptions& options, std::string& /*error*/) {
     switch (options.source) {
@@ -26,7 +55,7 @@ std::unique_ptr<BasebandSource> makeBasebandSource(const ServiceOptions& options
             return std::make_unique<ReplaySource>(
                 ReplaySource::Settings{options.input, options.speed, options.fast, options.loop});
         case SourceKind::Live:
-            return std::make_unique<LiveSource>(options.device);
+            return std::make_unique<LiveSource>(liveSettings(options));
         case SourceKind::Sim:
             break;
     }

@@ -10,9 +10,15 @@
 
 #include "service/BasebandSource.h"
 #include "service/ServiceOptions.h"
+#include "service/live/LiveSource.h"
 
 namespace velmar {
 
 std::unique_ptr<BasebandSource> makeBasebandSource(const ServiceOptions& options, std::string& error);
+
+// The live source's settings: the command line's, with the timing that VELMAR_DIAG_RESPONSE_SECONDS,
+// VELMAR_DIAG_KEEPALIVE_SECONDS and VELMAR_DIAG_RETRY_SECONDS may shorten (tests), and the device root of
+// $VELMAR_SYSROOT.
+LiveSource::Settings liveSettings(const ServiceOptions& options);
 
 }  // namespace velmar

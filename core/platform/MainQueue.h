@@ -1,6 +1,6 @@
-// MainQueue: the one thread on which the monitor does everything, and the four things it offers: run a
+// MainQueue: the one thread on which the monitor does everything, and the things it offers: run a
 // function soon, run one after a delay, run one repeatedly, and run one whenever a file descriptor is
-// readable.
+// readable (or writable: a non-blocking writer waits for room this way instead of blocking).
 //
 // Contract: every callback runs on the queue's thread, never re-entrantly from inside the call that
 // scheduled it. Handles cancel what they scheduled; cancelling from inside the callback itself is allowed.
@@ -14,7 +14,7 @@
 namespace velmar {
 
 class MainQueue {
-public:
+  public:
     using Task = std::function<void()>;
     using Handle = std::uint64_t;  // 0 is never a valid handle
 
@@ -26,6 +26,8 @@ public:
     virtual void cancelTimer(Handle timer) = 0;
     // Calls onReadable whenever fd has data or has hung up, until unwatched.
     virtual Handle watchReadable(int fd, Task onReadable) = 0;
+    // Calls onWritable whenever fd can take more data (or has failed or hung up), until unwatched.
+    virtual Handle watchWritable(int fd, Task onWritable) = 0;
     virtual void unwatch(Handle watch) = 0;
 
     static MainQueue& current();

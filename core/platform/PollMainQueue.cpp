@@ -21,7 +21,9 @@ MainQueue& MainQueue::current() {
     return *currentQueue;
 }
 
-void MainQueue::setCurrent(MainQueue* queue) { currentQueue = queue; }
+void MainQueue::setCurrent(MainQueue* queue) {
+    currentQueue = queue;
+}
 
 PollMainQueue::PollMainQueue() {
     if (pipe2(wakePipe_, O_CLOEXEC | O_NONBLOCK) != 0) {
@@ -40,11 +42,14 @@ PollMainQueue::~PollMainQueue() {
     }
 }
 
-void PollMainQueue::async(Task task) { pending_.push_back(std::move(task)); }
+void PollMainQueue::async(Task task) {
+    pending_.push_back(std::move(task));
+}
 
 MainQueue::Handle PollMainQueue::after(double seconds, Task task) {
     const Handle handle = nextHandle_++;
-    const auto delay = std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(std::max(0.0, seconds)));
+    const auto delay =
+        std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(std::max(0.0, seconds)));
     timers_.emplace(handle, Timer{Clock::now() + delay, Clock::duration::zero(), std::move(task)});
     return handle;
 }
@@ -57,15 +62,25 @@ MainQueue::Handle PollMainQueue::repeating(double intervalSeconds, Task task) {
     return handle;
 }
 
-void PollMainQueue::cancelTimer(Handle timer) { timers_.erase(timer); }
+void PollMainQueue::cancelTimer(Handle timer) {
+    timers_.erase(timer);
+}
 
 MainQueue::Handle PollMainQueue::watchReadable(int fd, Task onReadable) {
     const Handle handle = nextHandle_++;
-    watches_.emplace(handle, Watch{fd, std::move(onReadable)});
+    watches_.emplace(handle, Watch{fd, POLLIN, std::move(onReadable)});
     return handle;
 }
 
-void PollMainQueue::unwatch(Handle watch) { watches_.erase(watch); }
+MainQueue::Handle PollMainQueue::watchWritable(int fd, Task onWritable) {
+    const Handle handle = nextHandle_++;
+    watches_.emplace(handle, Watch{fd, POLLOUT, std::move(onWritable)});
+    return handle;
+}
+
+void PollMainQueue::unwatch(Handle watch) {
+    watches_.erase(watch);
+}
 
 void PollMainQueue::wake() {
     if (wakePipe_[1] >= 0) {
@@ -98,14 +113,15 @@ void PollMainQueue::turn(Clock::time_point deadline) {
         wakeAt = Clock::now();
     }
     const auto wait = std::chrono::duration_cast<std::chrono::milliseconds>(wakeAt - Clock::now());
-    const int timeoutMs = static_cast<int>(std::clamp<long long>(wait.count() + (wait.count() >= 0 ? 1 : 0), 0, 60'000));
+    const int timeoutMs =
+        static_cast<int>(std::clamp<long long>(wait.count() + (wait.count() >= 0 ? 1 : 0), 0, 60'000));
 
     std::vector<pollfd> fds;
     std::vector<Handle> owners;
     fds.push_back({wakePipe_[0], POLLIN, 0});
     owners.push_back(0);
     for (const auto& [handle, watch] : watches_) {
-        fds.push_back({watch.fd, POLLIN, 0});
+        fds.push_back({watch.fd, watch.events, 0});
         owners.push_back(handle);
     }
     const int ready_count = poll(fds.data(), fds.size(), timeoutMs);
@@ -122,7 +138,7 @@ void PollMainQueue::turn(Clock::time_point deadline) {
             // The watch may have been removed by an earlier callback of this turn.
             const auto found = watches_.find(owners[i]);
             if (found != watches_.end()) {
-                Task callback = found->second.onReadable;
+                Task callback = found->second.callback;
                 callback();
             }
         }
@@ -164,7 +180,8 @@ void PollMainQueue::run() {
 }
 
 void PollMainQueue::runFor(double seconds) {
-    const auto deadline = Clock::now() + std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(seconds));
+    const auto deadline =
+        Clock::now() + std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(seconds));
     stopped_ = false;
     while (!stopped_ && Clock::now() < deadline) {
         turn(deadline);
@@ -172,8 +189,8 @@ void PollMainQueue::runFor(double seconds) {
 }
 
 bool PollMainQueue::runUntil(const std::function<bool()>& predicate, double timeoutSeconds) {
-    const auto deadline =
-        Clock::now() + std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(timeoutSeconds));
+    const auto deadline = Clock::now() + std::chrono::duration_cast<Clock::duration>(
+                                             std::chrono::duration<double>(timeoutSeconds));
     stopped_ = false;
     while (!predicate()) {
         if (stopped_ || Clock::now() >= deadline) {

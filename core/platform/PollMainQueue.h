@@ -15,7 +15,7 @@
 namespace velmar {
 
 class PollMainQueue : public MainQueue {
-public:
+  public:
     PollMainQueue();
     ~PollMainQueue() override;
 
@@ -24,6 +24,7 @@ public:
     Handle repeating(double intervalSeconds, Task task) override;
     void cancelTimer(Handle timer) override;
     Handle watchReadable(int fd, Task onReadable) override;
+    Handle watchWritable(int fd, Task onWritable) override;
     void unwatch(Handle watch) override;
 
     void run();
@@ -34,7 +35,7 @@ public:
     // Wakes the loop from another thread or a signal handler (async-signal-safe).
     void wake();
 
-private:
+  private:
     using Clock = std::chrono::steady_clock;
     struct Timer {
         Clock::time_point due;
@@ -43,7 +44,8 @@ private:
     };
     struct Watch {
         int fd;
-        Task onReadable;
+        short events;  // POLLIN or POLLOUT
+        Task callback;
     };
 
     // One pass: waits at most until the deadline (or the next timer), then runs what is due.

@@ -135,8 +135,10 @@ TEST(ServiceOptions, TheSimulatedBasebandIsTheDefaultSource) {
 
 TEST_F(ServiceArgumentsTest, TheHelpNamesTheSimulatorsOptions) {
     const std::vector<std::string> lines = linesOf(runService({"--help"}).out);
-    ASSERT_GE(lines.size(), 3U);
-    EXPECT_EQ(lines[2], "                 [--scenario drive|walk|static] [--rate-multiplier X]");
+    ASSERT_GE(lines.size(), 4U);
+    EXPECT_EQ(lines[2],
+              "                 [--scenario drive|walk|static] [--rate-multiplier X] [--subscription N]");
+    EXPECT_EQ(lines[3], "                 [--record FILE] | --list-devices");
 }
 
 TEST_F(ServiceArgumentsTest, ASecondInstanceFindsThePortHeldAndExitsOne) {

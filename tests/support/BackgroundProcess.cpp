@@ -160,4 +160,12 @@ std::vector<std::string> linesOf(const std::string& text) {
     return lines;
 }
 
+std::size_t occurrences(const std::string& text, const std::string& what) {
+    std::size_t count = 0;
+    for (std::size_t at = text.find(what); at != std::string::npos; at = text.find(what, at + 1)) {
+        ++count;
+    }
+    return count;
+}
+
 }  // namespace velmar::testing

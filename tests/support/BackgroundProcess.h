@@ -45,5 +45,7 @@ bool waitUntil(const std::function<bool()>& holds, double timeoutSeconds);
 
 // The lines of text.
 std::vector<std::string> linesOf(const std::string& text);
+// How often what occurs in text (occurrences may overlap).
+std::size_t occurrences(const std::string& text, const std::string& what);
 
 }  // namespace velmar::testing

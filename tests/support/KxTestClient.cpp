@@ -107,6 +107,12 @@ bool KxTestClient::start(const std::vector<std::int64_t>& codes,
     return send(command);
 }
 
+bool KxTestClient::stopStreaming() {
+    auto command = PlistDictionary::create();
+    command->set(kKxSetStateKey, "Stopped");
+    return send(command);
+}
+
 void KxTestClient::disconnect() {
     if (receivePort_) {
         receivePort_->invalidate();

@@ -30,6 +30,8 @@ class KxTestClient {
     std::optional<std::string> technology();
     // Sends the log-code start command {"SetState": "Streaming", "SetOrvaneLogCodes", "SetKxExtraCodes"}.
     bool start(const std::vector<std::int64_t>& codes, const std::vector<std::int64_t>& extraCodes);
+    // Sends {"SetState": "Stopped"}: the channel stays, streaming ends.
+    bool stopStreaming();
     // Sends any command without waiting for an answer.
     bool send(const PlistValue& command);
     // Sends a command and answers the parsed reply.

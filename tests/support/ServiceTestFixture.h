@@ -33,13 +33,15 @@ class ServiceTest : public ::testing::Test {
         unsetenv("VELMAR_RUNTIME_DIR");
     }
 
-    // Starts kxserverd with arguments (log lines at notice and above mirrored to its standard error) and
-    // waits until it serves.
-    ServiceProcess& startService(const std::vector<std::string>& arguments) {
+    // Starts kxserverd with arguments (log lines at notice and above mirrored to its standard error), and
+    // the environment's extra assignments, and waits until it serves.
+    ServiceProcess& startService(const std::vector<std::string>& arguments,
+                                 const std::vector<std::string>& environment = {}) {
         std::vector<std::string> all = arguments;
         all.push_back("--log-stderr");
-        service_ = std::make_unique<ServiceProcess>(all, files_.path(),
-                                                    std::vector<std::string>{"VELMAR_LOG_LEVEL=notice"});
+        std::vector<std::string> assignments = {"VELMAR_LOG_LEVEL=notice"};
+        assignments.insert(assignments.end(), environment.begin(), environment.end());
+        service_ = std::make_unique<ServiceProcess>(all, files_.path(), assignments);
         const bool serving = service_->waitUntilServing(kWaitSeconds);
         EXPECT_TRUE(serving) << service_->errorOutput();
         return *service_;

@@ -1,21 +1,29 @@
 // velmar --headless as a user runs it, against a real kxserverd: it connects and shows a tree that changes,
 // survives the service being killed and reconnects when it is back, lets a second monitor find its port
-// taken, redraws at most once per display tick, and ends cleanly on SIGTERM.
+// taken, redraws at most once per display tick, and ends cleanly on SIGTERM; and the same against a live
+// modem (the emulator on a pseudo-terminal) that kxserverd finds by itself and that is unplugged and
+// plugged in again.
 #include <gtest/gtest.h>
 #include <signal.h>
 
 #include <chrono>
 #include <cstdint>
 #include <memory>
+#include <set>
 #include <string>
 #include <thread>
 #include <vector>
 
+#include "core/platform/PollMainQueue.h"
 #include "tests/support/BackgroundProcess.h"
 #include "tests/support/Json.h"
+#include "tests/support/KxTestClient.h"
+#include "tests/support/LiveModem.h"
+#include "tests/support/ServiceProcess.h"
 #include "tests/support/TestPaths.h"
 #include "tests/ui/ChangingValues.h"
 #include "tests/ui/KxServerProcess.h"
+#include "tools/modem-emulator/ModemEmulator.h"
 
 namespace velmar {
 namespace {
@@ -49,14 +57,6 @@ std::size_t connectedLines(const std::string& output) {
     std::size_t count = 0;
     for (const HeadlessLine& line : headlessLines(output)) {
         count += line.connected ? 1 : 0;
-    }
-    return count;
-}
-
-std::size_t occurrences(const std::string& text, const std::string& what) {
-    std::size_t count = 0;
-    for (std::size_t at = text.find(what); at != std::string::npos; at = text.find(what, at + 1)) {
-        ++count;
     }
     return count;
 }
@@ -104,7 +104,7 @@ TEST_F(HeadlessEndToEndTest, ConnectsAndShowsATreeThatChanges) {
     EXPECT_FALSE(snapshots.back().empty());
     EXPECT_NE(testing::busiestPane(snapshots), "")
         << "no value changed over " << snapshots.size() << " redraws";
-    EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** Created ports (send="), 1u)
+    EXPECT_EQ(testing::occurrences(monitor->errorOutput(), " ***** Created ports (send="), 1u)
         << monitor->errorOutput();
     EXPECT_NE(monitor->errorOutput().find("Got log generated: 0x"), std::string::npos);
 }
@@ -130,8 +130,8 @@ TEST_F(HeadlessEndToEndTest, SurvivesTheServiceBeingKilledAndReconnectsWhenItIsB
         },
         15))
         << monitor->errorOutput();
-    EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** INVALIDATED 0x"), 1u);
-    EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** Created ports (send="), 2u)
+    EXPECT_EQ(testing::occurrences(monitor->errorOutput(), " ***** INVALIDATED 0x"), 1u);
+    EXPECT_EQ(testing::occurrences(monitor->errorOutput(), " ***** Created ports (send="), 2u)
         << monitor->errorOutput();
     const std::vector<HeadlessLine> lines = headlessLines(monitor->standardOutput());
     EXPECT_TRUE(lines.back().tree.isDictionary());
@@ -184,6 +184,91 @@ TEST_F(HeadlessEndToEndTest, SigtermEndsTheMonitorWithStatusZero) {
     const auto status = monitor->waitForExit(10);
     ASSERT_TRUE(status.has_value());
     EXPECT_EQ(*status, 0);
+}
+
+TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvivesAReplug) {
+    using Codes = std::set<std::uint16_t>;
+    const Codes lteCodes = {0xB0C1, 0xB0C2, 0xB179, 0xB17F, 0xB180, 0xB186};
+    testing::TemporaryDirectory root;
+    testing::FakeSysfs sysfs(root.path());
+    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0x30, "05c6", "90db", "usb-Maker_Modem_7-if00-port0"});
+    testing::ModemEmulator::Settings settings;
+    settings.capturePath = std::string(VELMAR_SOURCE_DIR) + "/samples/captures/lte-connected-1.qmdl";
+    settings.linkPath = sysfs.devicePath("ttyUSB0");
+    testing::ModemEmulator modem(settings);
+    std::string error;
+    ASSERT_TRUE(modem.start(error)) << error;
+    std::vector<std::string> serviceEnvironment = environment();
+    serviceEnvironment.push_back("VELMAR_SYSROOT=" + root.path());
+    serviceEnvironment.push_back("VELMAR_LOG_LEVEL=notice");
+    // This process talks to the service too (as a second monitor): in the same runtime directory.
+    setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
+    struct Unset {
+        ~Unset() { unsetenv("VELMAR_RUNTIME_DIR"); }
+    } unset;
+    testing::ServiceProcess service({"--source", "live", "--device", "auto", "--log-stderr"}, outputs_.path(),
+                                    serviceEnvironment);
+    ASSERT_TRUE(service.waitUntilServing(30)) << service.errorOutput();
+    testing::TemporaryDirectory monitorOutputs;
+    auto monitor = startMonitor(monitorOutputs.path());
+
+    // The capture's values on screen: its LTE intra-frequency measurement carries subframe number 2075.
+    const auto showsTheCapture = [](const std::string& out) {
+        for (const HeadlessLine& line : headlessLines(out)) {
+            for (const auto& [path, value] : testing::leavesOfJson(line.tree)) {
+                if (line.connected && path.ends_with("/Subframe Number") && value == "2075") {
+                    return true;
+                }
+            }
+        }
+        return false;
+    };
+    ASSERT_TRUE(monitor->waitForOutput(showsTheCapture, 30))
+        << service.errorOutput() << monitor->errorOutput();
+    EXPECT_EQ(modem.enabledCodes(), lteCodes);
+
+    // A second monitor joins with another code, then leaves: the masks follow.
+    PollMainQueue queue;
+    const MainQueue::Handle tick = queue.repeating(0.01, [] {});
+    {
+        testing::KxTestClient second(queue, "second");
+        ASSERT_TRUE(second.connect()) << second.error();
+        ASSERT_TRUE(second.start({0xB193}, {}));
+        Codes both = lteCodes;
+        both.insert(0xB193);
+        EXPECT_TRUE(queue.runUntil([&] { return modem.enabledCodes() == both; }, 30));
+        EXPECT_TRUE(queue.runUntil([&] { return second.blobs().size() >= 5; }, 30));
+        second.disconnect();
+        EXPECT_TRUE(queue.runUntil([&] { return modem.enabledCodes() == lteCodes; }, 30));
+    }
+    queue.cancelTimer(tick);
+
+    // Unplugged and plugged in again: the service heals by itself and the monitor goes on.
+    modem.vanish();
+    ASSERT_TRUE(service.waitForError(": the device went away (", 10)) << service.errorOutput();
+    const std::size_t linesBefore = testing::linesOf(monitor->standardOutput()).size();
+    ASSERT_TRUE(modem.comeBack());
+    EXPECT_TRUE(testing::waitUntil([&] { return modem.enabledCodes() == lteCodes; }, 3.0))
+        << service.errorOutput();
+    EXPECT_TRUE(monitor->waitForOutput(
+        [&](const std::string& out) {
+            const std::vector<HeadlessLine> lines = headlessLines(out);
+            return lines.size() >= linesBefore + 2 && lines.back().connected;
+        },
+        15));
+    EXPECT_TRUE(
+        service.waitForError("<5> live: " + sysfs.devicePath("ttyUSB0") + ": the device is back\n", 10));
+    EXPECT_EQ(monitor->errorOutput().find("INVALIDATED"), std::string::npos) << "the channel survived";
+
+    // SIGTERM leaves the modem with logging off.
+    service.sendSignal(SIGTERM);
+    EXPECT_EQ(service.waitForExit(10), std::optional<int>(0));
+    EXPECT_TRUE(modem.enabledCodes().empty());
+    const std::vector<PlistData> requests = modem.requests();
+    ASSERT_GE(requests.size(), 3U);
+    EXPECT_EQ(testing::hexOf(requests[requests.size() - 3]), "73 00 00 00 00 00 00 00");
+    EXPECT_EQ(testing::hexOf(requests[requests.size() - 2]), "60 00");
+    EXPECT_EQ(testing::hexOf(requests[requests.size() - 1]), "7d 05 00 00 00 00 00 00");
 }
 
 // Every technology of the simulated baseband reaches the screen as a connected tree whose values change.

@@ -1,8 +1,9 @@
-// The Qt binding of the main queue: the monitor's four kinds of work on Qt's event loop.
+// The Qt binding of the main queue: the monitor's kinds of work on Qt's event loop.
 #ifdef VELMAR_WITH_QT
 
 #include "ui/qt/QtMainQueue.h"
 
+#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <unistd.h>
 
@@ -89,6 +90,30 @@ TEST_F(QtMainQueueTest, WatchReadableFiresOnDataAndOnHangUpUntilUnwatched) {
     ASSERT_TRUE(QTest::qWaitFor([&] { return hungUp; }, 1000));
     QTest::qWait(50);
     close(fds[0]);
+}
+
+TEST_F(QtMainQueueTest, WatchWritableFiresOnceTheDescriptorHasRoomAgain) {
+    int fds[2];
+    ASSERT_EQ(pipe2(fds, O_NONBLOCK), 0);
+    const std::string block(4096, 'x');
+    while (write(fds[1], block.data(), block.size()) > 0) {
+    }
+    int fired = 0;
+    MainQueue::Handle watch = 0;
+    watch = queue_.watchWritable(fds[1], [&] {
+        ++fired;
+        queue_.unwatch(watch);
+    });
+    QTest::qWait(50);
+    EXPECT_EQ(fired, 0) << "the pipe is full";
+    char drain[65536];
+    while (read(fds[0], drain, sizeof drain) > 0) {
+    }
+    ASSERT_TRUE(QTest::qWaitFor([&] { return fired == 1; }, 1000));
+    QTest::qWait(50);
+    EXPECT_EQ(fired, 1);
+    close(fds[0]);
+    close(fds[1]);
 }
 
 TEST_F(QtMainQueueTest, WorkStillScheduledWhenTheQueueGoesNeverRuns) {

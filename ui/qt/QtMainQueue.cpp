@@ -74,9 +74,18 @@ void QtMainQueue::cancelTimer(Handle handle) {
 }
 
 MainQueue::Handle QtMainQueue::watchReadable(int fd, Task onReadable) {
+    return watch(fd, false, std::move(onReadable));
+}
+
+MainQueue::Handle QtMainQueue::watchWritable(int fd, Task onWritable) {
+    return watch(fd, true, std::move(onWritable));
+}
+
+MainQueue::Handle QtMainQueue::watch(int fd, bool writable, Task callback) {
     const Handle handle = nextHandle_++;
-    auto* notifier = new QSocketNotifier(static_cast<qintptr>(fd), QSocketNotifier::Read, context_.get());
-    auto shared = std::make_shared<Task>(std::move(onReadable));
+    auto* notifier = new QSocketNotifier(
+        static_cast<qintptr>(fd), writable ? QSocketNotifier::Write : QSocketNotifier::Read, context_.get());
+    auto shared = std::make_shared<Task>(std::move(callback));
     QObject::connect(notifier, &QSocketNotifier::activated, notifier, [shared] {
         const std::shared_ptr<Task> keep = shared;
         (*keep)();
