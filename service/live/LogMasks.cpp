@@ -1,6 +1,7 @@
 #include "service/live/LogMasks.h"
 
 #include <algorithm>
+#include <array>
 #include <bit>
 
 namespace velmar::live {
@@ -18,24 +19,41 @@ EquipmentLogMask emptyMask(std::uint32_t equipment, std::uint32_t itemCount) {
     return mask;
 }
 
+// The wanted items of each equipment id, ascending.
+std::array<std::vector<std::uint32_t>, kEquipmentIdCount> wantedItems(const LogCodeFilter& demand) {
+    std::array<std::vector<std::uint32_t>, kEquipmentIdCount> items;
+    const auto& codes = demand.codes();
+    const auto add = [&items](std::size_t code) {
+        items[code >> kItemBits].push_back(static_cast<std::uint32_t>(code & kItemMask));
+    };
+#if defined(__GLIBCXX__)
+    // A word at a time: a demand is recomputed on every channel change, and most of the 65,536 bits are
+    // clear.
+    for (std::size_t code = codes._Find_first(); code < codes.size(); code = codes._Find_next(code)) {
+        add(code);
+    }
+#else
+    for (std::size_t code = 0; code < codes.size(); ++code) {
+        if (codes.test(code)) {
+            add(code);
+        }
+    }
+#endif
+    return items;
+}
+
 }  // namespace
 
 std::vector<EquipmentLogMask> logMasksFor(const LogCodeFilter& demand, const EquipmentRanges& ranges) {
     std::vector<EquipmentLogMask> masks;
-    const auto& codes = demand.codes();
+    const std::array<std::vector<std::uint32_t>, kEquipmentIdCount> items = wantedItems(demand);
     for (std::uint32_t equipment = 0; equipment < kEquipmentIdCount; ++equipment) {
-        const std::uint32_t first = equipment << kItemBits;
-        std::uint32_t highestWanted = 0;
-        bool wanted = false;
-        for (std::uint32_t item = 0; item <= kItemMask; ++item) {
-            if (codes.test(first + item)) {
-                highestWanted = item;
-                wanted = true;
-            }
-        }
+        const std::vector<std::uint32_t>& wanted = items[equipment];
         const std::uint32_t reported = ranges[equipment];
+        const std::uint32_t highestWanted = wanted.empty() ? 0 : wanted.back();
         if (demand.takesEverything() && reported != 0) {
-            EquipmentLogMask mask = emptyMask(equipment, std::max(reported, wanted ? highestWanted + 1 : 0));
+            EquipmentLogMask mask =
+                emptyMask(equipment, std::max(reported, wanted.empty() ? 0 : highestWanted + 1));
             std::fill(mask.bits.begin(), mask.bits.end(), 0xFF);
             if (mask.itemCount % 8 != 0) {
                 mask.bits.back() = static_cast<std::uint8_t>((1U << (mask.itemCount % 8)) - 1);
@@ -43,14 +61,12 @@ std::vector<EquipmentLogMask> logMasksFor(const LogCodeFilter& demand, const Equ
             masks.push_back(std::move(mask));
             continue;
         }
-        if (!wanted) {
+        if (wanted.empty()) {
             continue;
         }
         EquipmentLogMask mask = emptyMask(equipment, std::max(reported, highestWanted + 1));
-        for (std::uint32_t item = 0; item <= highestWanted; ++item) {
-            if (codes.test(first + item)) {
-                mask.bits[item / 8] = static_cast<std::uint8_t>(mask.bits[item / 8] | 1U << (item % 8));
-            }
+        for (const std::uint32_t item : wanted) {
+            mask.bits[item / 8] = static_cast<std::uint8_t>(mask.bits[item / 8] | 1U << (item % 8));
         }
         masks.push_back(std::move(mask));
     }
