@@ -321,11 +321,12 @@ void ModemEmulator::run() {
         bool splitting = false;
         {
             const std::lock_guard<std::mutex> lock(mutex_);
-            if (pty_.master >= 0) {
-                fds[1] = {pty_.master,
-                          static_cast<short>(POLLIN | (outputSent_ < output_.size() ? POLLOUT : 0)), 0};
-            }
             splitting = split_ && outputSent_ < output_.size();
+            if (pty_.master >= 0) {
+                // Split output goes a piece per millisecond, so that the port reads it in pieces.
+                const bool waitForRoom = outputSent_ < output_.size() && !splitting;
+                fds[1] = {pty_.master, static_cast<short>(POLLIN | (waitForRoom ? POLLOUT : 0)), 0};
+            }
         }
         poll(fds, 2, splitting ? 1 : kTickMs);
         if (stopping_) {
