@@ -207,7 +207,7 @@ void DiagSession::onRanges(DiagRequests::Outcome outcome, ByteView response) {
 void DiagSession::setUpDone() {
     state_ = State::Ready;
     inForce_.clear();  // the set-up disabled every mask
-    loggingOn_ = false;
+    mayBeLogging_ = false;
     armKeepAlive();
     sendMasks();
 }
@@ -231,7 +231,7 @@ void DiagSession::sendMasks() {
     demandChanged_ = false;
     const std::vector<EquipmentLogMask> wanted = logMasksFor(demand_, ranges_);
     if (wanted.empty()) {
-        if (!loggingOn_ && inForce_.empty()) {
+        if (!mayBeLogging_) {
             masksSent();
             return;
         }
@@ -248,7 +248,7 @@ void DiagSession::sendMasks() {
                              }
                              checkLogConfig("log disable", outcome, response);
                              inForce_.clear();
-                             loggingOn_ = false;
+                             mayBeLogging_ = false;
                              SystemLog::log(kLogNotice, "live: %s: logging off (no channel streams)",
                                             name_.c_str());
                              maskAnswersDue_ = 0;
@@ -262,6 +262,8 @@ void DiagSession::sendMasks() {
         return;
     }
     masksInFlight_ = true;
+    // Even a set-mask that fails may have changed the device's mask: only a disable makes it sure again.
+    mayBeLogging_ = true;
     maskAnswersDue_ = updates.size();
     for (const EquipmentLogMask& mask : updates) {
         requests_.submit(setLogMaskRequest(mask), timing_.attempts,
@@ -306,7 +308,6 @@ void DiagSession::onMaskAnswer(const EquipmentLogMask& sent, DiagRequests::Outco
         const std::size_t codes = codesInMask(sent);
         if (codes != 0) {
             inForce_.push_back(sent);
-            loggingOn_ = true;
         }
         if (echo && echo->itemCount < sent.itemCount) {
             EquipmentLogMask kept = sent;
@@ -332,7 +333,6 @@ void DiagSession::onMaskAnswer(const EquipmentLogMask& sent, DiagRequests::Outco
         }
     }
     if (maskAnswersDue_ > 0 && --maskAnswersDue_ == 0) {
-        loggingOn_ = !inForce_.empty();
         masksSent();
     }
 }
@@ -401,8 +401,10 @@ void DiagSession::keepAlive() {
 }
 
 void DiagSession::onFrame(ByteView packet) {
-    if (requests_.offer(packet) != DiagRequests::Offer::Unmatched || state_ == State::Stopping ||
-        state_ == State::Stopped) {
+    // Before the probe is answered, a stray answer is likely the device's reply to whoever used the port
+    // last (what arrived after the port was flushed); after the end nothing is asked any more.
+    if (requests_.offer(packet) != DiagRequests::Offer::Unmatched || state_ == State::Probing ||
+        state_ == State::Stopping || state_ == State::Stopped) {
         return;
     }
     ++unmatched_;
@@ -473,7 +475,7 @@ void DiagSession::stop(std::function<void()> done) {
                          check("debug messages off")(outcome, response);
                          state_ = State::Stopped;
                          inForce_.clear();
-                         loggingOn_ = false;
+                         mayBeLogging_ = false;
                          SystemLog::log(kLogNotice, "live: %s: logging off", name_.c_str());
                          done();
                      });

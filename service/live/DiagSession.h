@@ -11,7 +11,8 @@
 // - setDemand() may come at any time: masks are recomputed (LogMasks) and what changed is sent once the
 //   set-up is done and no mask update is in flight; with nothing wanted, logging is disabled.
 // - Frames that the owner hands to onFrame() are the device's non-asynchronous packets: responses. One that
-//   matches no request is counted, and the first one is logged as a sign of another program on the port.
+//   matches no request once the probe has been answered is counted, and the first one is logged as a sign
+//   of another program on the port.
 // - After the set-up, a request that gets no answer, or a device silent for keepAliveSeconds that does not
 //   answer a version request, means the device stopped answering (Listener::stoppedAnswering).
 // - The listener is never called from inside a call into the session other than onFrame(), and may not
@@ -114,7 +115,7 @@ class DiagSession {
     LogCodeFilter demand_;
     EquipmentRanges ranges_{};
     std::vector<EquipmentLogMask> inForce_;
-    bool loggingOn_ = false;
+    bool mayBeLogging_ = false;  // a mask may be set on the device: nothing wanted means disable
     bool masksInFlight_ = false;
     bool demandChanged_ = false;
     bool readyTold_ = false;

@@ -227,7 +227,9 @@ void LiveSource::probeFailed() {
                          settings_.timing.probeAttempts, settings_.timing.responseSeconds);
     if (isAuto() && probing_) {
         SystemLog::log(kLogInfo, "live: auto: %s: silent", path.c_str());
-        silent_.push_back(probing_->tty);
+        if (probing_->tty != lastAnswered_) {
+            silent_.push_back(SilentPort{probing_->tty, std::chrono::steady_clock::now()});
+        }
         probing_.reset();
         closePort();
         queue_->async([this, alive = std::weak_ptr<bool>(alive_)] {
@@ -251,6 +253,7 @@ void LiveSource::ready() {
         everAnswered_ = true;
     } else if (probing_) {
         SystemLog::log(kLogNotice, "live: auto: using %s", live::describeCandidate(*probing_).c_str());
+        lastAnswered_ = probing_->tty;
         probing_.reset();
         noneFoundLogged_ = false;
     }
@@ -299,13 +302,17 @@ void LiveSource::lookForDevice() {
 
 void LiveSource::scanAndProbe() {
     candidates_ = live::findCandidatePorts(settings_.deviceRoot);
-    // A silent port that went away is probed again when it comes back.
-    std::erase_if(silent_, [this](const std::string& tty) {
-        return std::none_of(candidates_.begin(), candidates_.end(),
-                            [&](const CandidatePort& port) { return port.tty == tty; });
+    // A silent port is probed again when it went away and came back, or a while later (a modem that was
+    // still starting up); the port last in use is probed every time.
+    const auto now = std::chrono::steady_clock::now();
+    std::erase_if(silent_, [this, now](const SilentPort& silent) {
+        return now - silent.since >= kSilentRetryInterval ||
+               std::none_of(candidates_.begin(), candidates_.end(),
+                            [&](const CandidatePort& port) { return port.tty == silent.tty; });
     });
     std::erase_if(candidates_, [this](const CandidatePort& port) {
-        return std::find(silent_.begin(), silent_.end(), port.tty) != silent_.end();
+        return std::any_of(silent_.begin(), silent_.end(),
+                           [&](const SilentPort& silent) { return silent.tty == port.tty; });
     });
     nextCandidate_ = 0;
     probeNextCandidate();

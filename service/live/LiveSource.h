@@ -11,7 +11,8 @@
 //   demand (BlobSink::streamingDemand). A device named on the command line that does not answer the first
 //   probe is reported to the failure handler (the service ends). "auto" scans the USB serial ports
 //   (DeviceDiscovery), probes the candidates in order and takes the first that answers; candidates that
-//   stayed silent are not probed again until they go away and come back.
+//   stayed silent are probed again only when they went away and came back or kSilentRetryInterval later
+//   (the port last in use, every time).
 // - When the device goes away (a read or write fails, it hangs up) or stops answering, that is logged once,
 //   the channels stay, and the device is looked for again every retrySeconds (opened again, or, for "auto",
 //   scanned again) without spinning; when it is back it is probed and its masks are sent again.
@@ -72,6 +73,8 @@ class LiveSource : public BasebandSource, private live::DiagSession::Listener, p
     static constexpr int kReadsPerWake = 16;
     // How often the damage of a long stream is summed up (a few bad frames are described in full).
     static constexpr std::chrono::seconds kDamageReportInterval{60};
+    // How long "auto" leaves a candidate that stayed silent before it probes it again.
+    static constexpr std::chrono::seconds kSilentRetryInterval{30};
 
     bool isAuto() const { return settings_.device == kAutoDevice; }
     // Takes port into use: watches it and, for a device, starts a session on it.
@@ -116,7 +119,12 @@ class LiveSource : public BasebandSource, private live::DiagSession::Listener, p
     bool noneFoundLogged_ = false;
     std::vector<live::CandidatePort> candidates_;
     std::size_t nextCandidate_ = 0;
-    std::vector<std::string> silent_;  // candidates' ttys that did not answer
+    struct SilentPort {
+        std::string tty;
+        std::chrono::steady_clock::time_point since;
+    };
+    std::vector<SilentPort> silent_;  // candidates that did not answer
+    std::string lastAnswered_;        // the tty of the device last in use
     std::optional<live::CandidatePort> probing_;
 
     std::chrono::steady_clock::time_point lastDamageReport_ = std::chrono::steady_clock::now();
