@@ -204,6 +204,41 @@ TEST(ServiceOptions, ParsesEveryOptionInBothForms) {
               "--seed needs a non-negative integer, not \"18446744073709551616\"");
 }
 
+TEST(ServiceOptions, TheLiveSourcesOwnOptions) {
+    const ParsedServiceOptions live = parseServiceOptions(
+        {"--source", "live", "--device", "auto", "--subscription", "4294967295", "--record=/tmp/port.qmdl"});
+    ASSERT_EQ(live.error, "");
+    EXPECT_EQ(live.options.device, "auto");
+    EXPECT_EQ(live.options.subscription, std::optional<std::uint32_t>(4294967295U));
+    EXPECT_EQ(live.options.record, "/tmp/port.qmdl");
+    EXPECT_FALSE(live.options.listDevices);
+    EXPECT_FALSE(
+        parseServiceOptions({"--source", "live", "--device", "auto"}).options.subscription.has_value());
+
+    const struct {
+        std::vector<std::string> arguments;
+        std::string message;
+    } errors[] = {
+        {{"--source", "live", "--device", "auto", "--subscription", "4294967296"},
+         "--subscription needs an integer from 0 to 4294967295, not \"4294967296\""},
+        {{"--source", "live", "--device", "auto", "--subscription", "-1"},
+         "--subscription needs an integer from 0 to 4294967295, not \"-1\""},
+        {{"--subscription", "1"}, "--subscription does not apply to --source sim"},
+        {{"--source", "replay", "--input", "x", "--record", "y"},
+         "--record does not apply to --source replay"},
+        {{"--list-devices=yes"}, "--list-devices takes no value"},
+    };
+    for (const auto& testCase : errors) {
+        EXPECT_EQ(parseServiceOptions(testCase.arguments).error, testCase.message);
+    }
+
+    // Listing the ports needs no source.
+    const ParsedServiceOptions listing = parseServiceOptions({"--list-devices"});
+    ASSERT_EQ(listing.error, "");
+    EXPECT_TRUE(listing.options.listDevices);
+    EXPECT_EQ(parseServiceOptions({"--source", "live", "--list-devices"}).error, "");
+}
+
 TEST(ServiceOptions, MapsEachTechnologyToItsConstant) {
     const struct {
         const char* name;
