@@ -8,6 +8,8 @@
 
 #include <string>
 
+#include "tests/support/FullPipe.h"
+
 namespace velmar {
 namespace {
 
@@ -37,27 +39,20 @@ TEST(PollMainQueue, WatchReadableFiresOnDataAndOnHangUpUntilUnwatched) {
 
 TEST(PollMainQueue, WatchWritableFiresOnceTheDescriptorHasRoomAgain) {
     PollMainQueue queue;
-    int fds[2];
-    ASSERT_EQ(pipe2(fds, O_NONBLOCK), 0);
-    const std::string block(4096, 'x');
-    while (write(fds[1], block.data(), block.size()) > 0) {
-    }
+    testing::FullPipe pipe;
+    ASSERT_TRUE(pipe.isOpen());
     int fired = 0;
     MainQueue::Handle watch = 0;
-    watch = queue.watchWritable(fds[1], [&] {
+    watch = queue.watchWritable(pipe.writeEnd(), [&] {
         ++fired;
         queue.unwatch(watch);
     });
     queue.runFor(0.05);
     EXPECT_EQ(fired, 0) << "the pipe is full";
-    char drain[65536];
-    while (read(fds[0], drain, sizeof drain) > 0) {
-    }
+    pipe.drain();
     ASSERT_TRUE(queue.runUntil([&] { return fired == 1; }, 5));
     queue.runFor(0.05);
     EXPECT_EQ(fired, 1) << "unwatched from its own callback";
-    close(fds[0]);
-    close(fds[1]);
 }
 
 }  // namespace

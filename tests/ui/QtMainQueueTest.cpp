@@ -3,13 +3,13 @@
 
 #include "ui/qt/QtMainQueue.h"
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <unistd.h>
 
 #include <QElapsedTimer>
 #include <QTest>
 
+#include "tests/support/FullPipe.h"
 #include "tests/ui/QtTestApplication.h"
 
 namespace velmar {
@@ -93,27 +93,20 @@ TEST_F(QtMainQueueTest, WatchReadableFiresOnDataAndOnHangUpUntilUnwatched) {
 }
 
 TEST_F(QtMainQueueTest, WatchWritableFiresOnceTheDescriptorHasRoomAgain) {
-    int fds[2];
-    ASSERT_EQ(pipe2(fds, O_NONBLOCK), 0);
-    const std::string block(4096, 'x');
-    while (write(fds[1], block.data(), block.size()) > 0) {
-    }
+    testing::FullPipe pipe;
+    ASSERT_TRUE(pipe.isOpen());
     int fired = 0;
     MainQueue::Handle watch = 0;
-    watch = queue_.watchWritable(fds[1], [&] {
+    watch = queue_.watchWritable(pipe.writeEnd(), [&] {
         ++fired;
         queue_.unwatch(watch);
     });
     QTest::qWait(50);
     EXPECT_EQ(fired, 0) << "the pipe is full";
-    char drain[65536];
-    while (read(fds[0], drain, sizeof drain) > 0) {
-    }
+    pipe.drain();
     ASSERT_TRUE(QTest::qWaitFor([&] { return fired == 1; }, 1000));
     QTest::qWait(50);
     EXPECT_EQ(fired, 1);
-    close(fds[0]);
-    close(fds[1]);
 }
 
 TEST_F(QtMainQueueTest, WorkStillScheduledWhenTheQueueGoesNeverRuns) {
