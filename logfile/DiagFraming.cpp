@@ -3,6 +3,7 @@
 #include <array>
 
 #include "core/platform/BasebandPacket.h"
+#include "core/platform/RecordReader.h"
 #include "logfile/DlfFile.h"
 
 namespace velmar {
@@ -22,15 +23,6 @@ constexpr std::array<std::uint16_t, 256> makeCrcTable() {
 }
 
 constexpr std::array<std::uint16_t, 256> kCrcTable = makeCrcTable();
-
-std::uint16_t readLe16(const std::uint8_t* bytes) {
-    return static_cast<std::uint16_t>(bytes[0] | static_cast<unsigned>(bytes[1]) << 8);
-}
-
-std::uint32_t readLe32(const std::uint8_t* bytes) {
-    return bytes[0] | static_cast<std::uint32_t>(bytes[1]) << 8 | static_cast<std::uint32_t>(bytes[2]) << 16 |
-           static_cast<std::uint32_t>(bytes[3]) << 24;
-}
 
 DiagFrameContents bad(std::string problem) {
     DiagFrameContents contents;
@@ -90,7 +82,7 @@ DiagFrameContents readDiagFrame(std::span<std::uint8_t> payload) {
             return bad("wrapper of " + std::to_string(length - first) + " bytes holds no frame");
         }
         if (depth == 0) {
-            contents.subscription = readLe32(payload.data() + first + 4);
+            contents.subscription = RecordReader(payload.subspan(first)).u32(4);
         }
         first += kDiagWrapperHeaderSize;
         ++depth;
@@ -110,7 +102,7 @@ DiagFrameContents readDiagFrame(std::span<std::uint8_t> payload) {
         return damaged("log packet of " + std::to_string(packet.size()) +
                        " bytes is too short for a record length");
     }
-    const std::size_t recordLength = readLe16(packet.data() + 4);
+    const std::size_t recordLength = RecordReader(packet).u16(4);
     if (recordLength < kDlfHeaderSize) {
         return damaged("record length " + std::to_string(recordLength) + " is shorter than the " +
                        std::to_string(kDlfHeaderSize) + "-byte header");

@@ -3,6 +3,9 @@
 #include <algorithm>
 #include <cstdio>
 
+#include "core/platform/RecordReader.h"
+#include "core/platform/RecordWriter.h"
+
 namespace velmar::live {
 
 namespace {
@@ -27,18 +30,6 @@ constexpr std::uint8_t kLastDebugMessageCommand = 0x9E;
 constexpr std::size_t kLogConfigHeaderSize = 8;
 constexpr std::size_t kEventReportAnswerSize = 3;
 
-void putLe32(PlistData& out, std::uint32_t value) {
-    for (int shift = 0; shift < 32; shift += 8) {
-        out.push_back(static_cast<std::uint8_t>(value >> shift));
-    }
-}
-
-std::uint32_t readLe32(ByteView bytes, std::size_t offset) {
-    return bytes[offset] | static_cast<std::uint32_t>(bytes[offset + 1]) << 8 |
-           static_cast<std::uint32_t>(bytes[offset + 2]) << 16 |
-           static_cast<std::uint32_t>(bytes[offset + 3]) << 24;
-}
-
 // The text of a fixed-width field, up to its first NUL.
 std::string textField(ByteView bytes, std::size_t offset, std::size_t width) {
     const ByteView field = bytes.subspan(offset, width);
@@ -60,7 +51,7 @@ std::string nulTerminated(ByteView bytes, std::size_t offset, std::size_t& next)
 
 PlistData logConfigHeader(LogConfigOperation operation) {
     PlistData request = {kDiagLogConfigCommand, 0, 0, 0};
-    putLe32(request, static_cast<std::uint32_t>(operation));
+    RecordWriter(request).appendLE(4, static_cast<std::uint32_t>(operation));
     return request;
 }
 
@@ -90,7 +81,7 @@ PlistData eventReportsRequest(bool on) {
 
 PlistData debugMessagesOffRequest() {
     PlistData request = {kDiagDebugConfigCommand, kDiagDebugSetAllMasks, 0, 0};
-    putLe32(request, 0);
+    RecordWriter(request).appendLE(4, 0);
     return request;
 }
 
@@ -100,9 +91,7 @@ PlistData logConfigRequest(LogConfigOperation operation) {
 
 PlistData setLogMaskRequest(const EquipmentLogMask& mask) {
     PlistData request = logConfigHeader(LogConfigOperation::SetMask);
-    putLe32(request, mask.equipment);
-    putLe32(request, mask.itemCount);
-    request.insert(request.end(), mask.bits.begin(), mask.bits.end());
+    RecordWriter(request).appendLE(4, mask.equipment).appendLE(4, mask.itemCount).append(mask.bits);
     return request;
 }
 
@@ -123,7 +112,7 @@ std::string requestName(ByteView request) {
             return "debug messages off";
         case kDiagLogConfigCommand:
             if (request.size() >= kLogConfigHeaderSize) {
-                switch (static_cast<LogConfigOperation>(readLe32(request, 4))) {
+                switch (static_cast<LogConfigOperation>(RecordReader(request).u32(4))) {
                     case LogConfigOperation::DisableAll:
                         return "log disable";
                     case LogConfigOperation::RetrieveRanges:
@@ -182,7 +171,7 @@ bool answers(ByteView request, ByteView response) {
         case kDiagLogConfigCommand:
             // The operation sits at the same place in both.
             return request.size() >= kLogConfigHeaderSize && response.size() >= kLogConfigHeaderSize &&
-                   readLe32(request, 4) == readLe32(response, 4);
+                   RecordReader(request).u32(4) == RecordReader(response).u32(4);
         case kDiagDebugConfigCommand:
             return request.size() >= 2 && response.size() >= 2 && request[1] == response[1];
         default:
@@ -209,9 +198,10 @@ std::optional<BuildIdInfo> parseBuildIdResponse(ByteView response) {
     if (response.size() < kStringsStart || response[0] != kDiagBuildIdCommand) {
         return std::nullopt;
     }
+    const RecordReader fields(response);
     BuildIdInfo info;
-    info.hardwareVersion = readLe32(response, 4);
-    info.modelId = readLe32(response, 8);
+    info.hardwareVersion = fields.u32(4);
+    info.modelId = fields.u32(8);
     std::size_t next = 0;
     info.buildId = nulTerminated(response, kStringsStart, next);
     info.model = nulTerminated(response, next, next);
@@ -223,9 +213,10 @@ std::optional<LogConfigResponse> parseLogConfigResponse(ByteView response) {
     if (response.size() < kStatusEnd || response[0] != kDiagLogConfigCommand) {
         return std::nullopt;
     }
+    const RecordReader fields(response);
     LogConfigResponse parsed;
-    parsed.operation = readLe32(response, 4);
-    parsed.status = readLe32(response, 8);
+    parsed.operation = fields.u32(4);
+    parsed.status = fields.u32(8);
     parsed.rest = response.subspan(kStatusEnd);
     return parsed;
 }
@@ -234,9 +225,10 @@ std::optional<EquipmentRanges> parseLogRanges(const LogConfigResponse& response)
     if (response.rest.size() < kEquipmentIdCount * 4) {
         return std::nullopt;
     }
+    const RecordReader fields(response.rest);
     EquipmentRanges ranges{};
     for (std::size_t id = 0; id < kEquipmentIdCount; ++id) {
-        ranges[id] = readLe32(response.rest, id * 4);
+        ranges[id] = fields.u32(id * 4);
     }
     return ranges;
 }
@@ -245,7 +237,8 @@ std::optional<SetMaskEcho> parseSetMaskEcho(const LogConfigResponse& response) {
     if (response.rest.size() < 8) {
         return std::nullopt;
     }
-    return SetMaskEcho{readLe32(response.rest, 0), readLe32(response.rest, 4)};
+    const RecordReader fields(response.rest);
+    return SetMaskEcho{fields.u32(0), fields.u32(4)};
 }
 
 std::string logConfigStatusName(std::uint32_t status) {

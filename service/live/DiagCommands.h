@@ -2,13 +2,13 @@
 // the responses it gets back. Payloads only: DiagFraming frames them.
 //
 // Contract:
-// - Request builders answer the exact payload bytes (little-endian fields).
+// - Request builders answer the exact payload bytes (little-endian fields, written with RecordWriter).
 // - A response is recognised by answers(request, response): the same command byte (and, for log and
 //   debug-message configuration, the same operation), or an error response whose copy of the offending
 //   request starts with the request's command byte (or is empty). Asynchronous frames (log packets, event
 //   reports other than the 3-byte answer, debug messages) never answer a request.
-// - Parsers check every length before they read and answer nullopt for a response too short for what it
-//   must hold; text fields stop at their width or their first NUL, whichever comes first.
+// - Parsers read fields with RecordReader and answer nullopt for a response too short for what it must
+//   hold; text fields stop at their width or their first NUL, whichever comes first.
 #pragma once
 
 #include <array>

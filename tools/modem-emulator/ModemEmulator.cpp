@@ -11,6 +11,8 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "core/platform/RecordReader.h"
+#include "core/platform/RecordWriter.h"
 #include "core/platform/WholeFile.h"
 #include "logfile/DiagFraming.h"
 
@@ -28,18 +30,6 @@ constexpr std::size_t kSplitPiece = 5;
 constexpr int kTickMs = 10;
 constexpr std::uint8_t kBadCommand = 0x13;
 constexpr std::uint8_t kBadLength = 0x15;
-
-std::uint32_t le32(ByteView bytes, std::size_t offset) {
-    return bytes[offset] | static_cast<std::uint32_t>(bytes[offset + 1]) << 8 |
-           static_cast<std::uint32_t>(bytes[offset + 2]) << 16 |
-           static_cast<std::uint32_t>(bytes[offset + 3]) << 24;
-}
-
-void putLe32(PlistData& out, std::uint32_t value) {
-    for (int shift = 0; shift < 32; shift += 8) {
-        out.push_back(static_cast<std::uint8_t>(value >> shift));
-    }
-}
 
 void putText(PlistData& out, const char* text, std::size_t width) {
     for (std::size_t i = 0; i < width; ++i) {
@@ -59,7 +49,7 @@ std::vector<PlistData> checkedFrames(ByteView bytes, PlistData* rest, std::uint6
         if (byte == kDiagFrameEnd) {
             if (frame.size() >= 3 && !escaped) {
                 const std::size_t body = frame.size() - 2;
-                const unsigned sent = frame[body] | static_cast<unsigned>(frame[body + 1]) << 8;
+                const unsigned sent = RecordReader(frame).u16(body);
                 if (crc16X25(ByteView(frame.data(), body)) == sent) {
                     frame.resize(body);
                     frames.push_back(std::move(frame));
@@ -97,7 +87,7 @@ std::optional<std::uint16_t> logCodeOf(ByteView payload) {
     if (payload.size() < 16 || payload[0] != kDiagLogPacket) {
         return std::nullopt;
     }
-    return static_cast<std::uint16_t>(payload[6] | payload[7] << 8);
+    return static_cast<std::uint16_t>(RecordReader(payload).u16(6));
 }
 
 }  // namespace
@@ -372,7 +362,7 @@ void ModemEmulator::readRequests() {
 void ModemEmulator::queueFrame(ByteView payload, bool response) {
     if (response && settings_.wrapResponses) {
         PlistData wrapped = {kDiagWrapper, 0x01, 0x00, 0x00};
-        putLe32(wrapped, 1);
+        RecordWriter(wrapped).appendLE(4, 1);
         wrapped.insert(wrapped.end(), payload.begin(), payload.end());
         appendDiagFrame(output_, wrapped);
         return;
@@ -390,7 +380,7 @@ void ModemEmulator::answer(PlistData request) {
     const std::uint8_t command = request[0];
     std::int64_t operation = -1;
     if (command == 0x73 && request.size() >= 8) {
-        operation = le32(request, 4);
+        operation = RecordReader(request).u32(4);
     }
     for (const std::int64_t key : {operation, std::int64_t{-1}}) {
         const auto error = errors_.find({command, key});
@@ -414,8 +404,8 @@ void ModemEmulator::answer(PlistData request) {
             break;
         case 0x7C: {
             reply = {0x7C, 0x01, 0x00, 0x00};
-            putLe32(reply, 0x000000E1);
-            putLe32(reply, 0x00001234);
+            RecordWriter(reply).appendLE(4, 0x000000E1);
+            RecordWriter(reply).appendLE(4, 0x00001234);
             const std::string build = "EMU.1.0.0-velmar";
             const std::string model = "velmar modem emulator";
             reply.insert(reply.end(), build.begin(), build.end());
@@ -457,7 +447,7 @@ void ModemEmulator::answerLogConfig(const PlistData& request) {
         queueFrame(reply, true);
         return;
     }
-    const std::uint32_t operation = le32(request, 4);
+    const std::uint32_t operation = RecordReader(request).u32(4);
     PlistData reply(request.begin(), request.begin() + 8);
     switch (operation) {
         case 0:
@@ -466,12 +456,12 @@ void ModemEmulator::answerLogConfig(const PlistData& request) {
             }
             itemCounts_.fill(0);
             masksChanged();
-            putLe32(reply, 0);
+            RecordWriter(reply).appendLE(4, 0);
             break;
         case 1:
-            putLe32(reply, 0);
+            RecordWriter(reply).appendLE(4, 0);
             for (const std::uint32_t range : settings_.ranges) {
-                putLe32(reply, range);
+                RecordWriter(reply).appendLE(4, range);
             }
             break;
         case 3: {
@@ -480,8 +470,8 @@ void ModemEmulator::answerLogConfig(const PlistData& request) {
                 reply.insert(reply.end(), request.begin(), request.end());
                 break;
             }
-            const std::uint32_t id = le32(request, 8);
-            std::uint32_t count = std::min<std::uint32_t>(le32(request, 12), 0x1000);
+            const std::uint32_t id = RecordReader(request).u32(8);
+            std::uint32_t count = std::min<std::uint32_t>(RecordReader(request).u32(12), 0x1000);
             const std::size_t bytes = (count + 7) / 8;
             if (request.size() < 16 + bytes) {
                 reply = {kBadLength};
@@ -489,14 +479,14 @@ void ModemEmulator::answerLogConfig(const PlistData& request) {
                 break;
             }
             if (id >= masks_.size()) {
-                putLe32(reply, 1);
+                RecordWriter(reply).appendLE(4, 1);
                 break;
             }
             const auto status = maskStatus_.find(id);
             if (status != maskStatus_.end() && status->second != 0) {
-                putLe32(reply, status->second);
-                putLe32(reply, id);
-                putLe32(reply, 0);
+                RecordWriter(reply).appendLE(4, status->second);
+                RecordWriter(reply).appendLE(4, id);
+                RecordWriter(reply).appendLE(4, 0);
                 break;
             }
             if (settings_.trimToRanges) {
@@ -510,26 +500,26 @@ void ModemEmulator::answerLogConfig(const PlistData& request) {
             masks_[id] = mask;
             itemCounts_[id] = count;
             masksChanged();
-            putLe32(reply, 0);
-            putLe32(reply, id);
-            putLe32(reply, count);
+            RecordWriter(reply).appendLE(4, 0);
+            RecordWriter(reply).appendLE(4, id);
+            RecordWriter(reply).appendLE(4, count);
             reply.insert(reply.end(), mask.begin(), mask.end());
             break;
         }
         case 4: {
-            const std::uint32_t id = request.size() >= 12 ? le32(request, 8) : 0;
+            const std::uint32_t id = request.size() >= 12 ? RecordReader(request).u32(8) : 0;
             if (id >= masks_.size()) {
-                putLe32(reply, 1);
+                RecordWriter(reply).appendLE(4, 1);
                 break;
             }
-            putLe32(reply, 0);
-            putLe32(reply, id);
-            putLe32(reply, itemCounts_[id]);
+            RecordWriter(reply).appendLE(4, 0);
+            RecordWriter(reply).appendLE(4, id);
+            RecordWriter(reply).appendLE(4, itemCounts_[id]);
             reply.insert(reply.end(), masks_[id].begin(), masks_[id].end());
             break;
         }
         default:
-            putLe32(reply, 1);
+            RecordWriter(reply).appendLE(4, 1);
             break;
     }
     queueFrame(reply, true);
