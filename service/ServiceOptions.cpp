@@ -69,7 +69,10 @@ std::string_view sourceName(SourceKind kind) {
 }
 
 std::string quoted(std::string_view text) {
-    return "\"" + std::string(text) + "\"";
+    std::string out;
+    out.reserve(text.size() + 2);
+    out.append(1, '"').append(text).append(1, '"');
+    return out;
 }
 
 std::optional<double> parsePositiveNumber(std::string_view given) {

@@ -119,11 +119,10 @@ std::string_view trimXmlSpace(std::string_view text) {
     return text;
 }
 
-// A short, single-line rendering of document text for an error message: printable ASCII is kept, anything
-// else shows as '?', and long text is cut.
-std::string printable(std::string_view text) {
+// Appends a short, single-line rendering of document text for an error message: printable ASCII is kept,
+// anything else shows as '?', and long text is cut.
+void appendPrintable(std::string& out, std::string_view text) {
     constexpr std::size_t kLimit = 40;
-    std::string out;
     for (std::size_t i = 0; i < text.size() && i < kLimit; ++i) {
         const auto c = static_cast<unsigned char>(text[i]);
         out.push_back(c >= 0x20 && c < 0x7F ? static_cast<char>(c) : '?');
@@ -131,11 +130,20 @@ std::string printable(std::string_view text) {
     if (text.size() > kLimit) {
         out.append("...");
     }
+}
+
+std::string printable(std::string_view text) {
+    std::string out;
+    appendPrintable(out, text);
     return out;
 }
 
+// The rendering between single quotes, built in one string.
 std::string quoted(std::string_view text) {
-    return "'" + printable(text) + "'";
+    std::string out(1, '\'');
+    appendPrintable(out, text);
+    out.push_back('\'');
+    return out;
 }
 
 std::optional<std::int64_t> parseInteger(std::string_view text) {

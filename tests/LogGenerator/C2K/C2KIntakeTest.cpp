@@ -22,7 +22,10 @@ PlistData statusPacket(std::uint16_t channel) {
 }
 
 PlistData withPrefix(const PlistData& packet) {
-    PlistData blob{0x81, 0x00};
+    PlistData blob;
+    blob.reserve(2 + packet.size());
+    blob.push_back(0x81);
+    blob.push_back(0x00);
     blob.insert(blob.end(), packet.begin(), packet.end());
     return blob;
 }
