@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "core/platform/BuildInfo.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/PollMainQueue.h"
 #include "core/platform/SystemLog.h"
@@ -51,6 +52,10 @@ int runKxServerd(int argc, char** argv) {
     const ParsedServiceOptions parsed = parseServiceOptions(std::vector<std::string>(argv + 1, argv + argc));
     if (parsed.help) {
         std::fputs(std::string(serviceUsage()).c_str(), stdout);
+        return 0;
+    }
+    if (parsed.version) {
+        std::fputs(BuildInfo::versionText(kProgramName).c_str(), stdout);
         return 0;
     }
     if (!parsed.error.empty()) {

@@ -269,8 +269,9 @@ ParsedServiceOptions parseServiceOptions(const std::vector<std::string>& argumen
         return parsed;
     };
     const CommandLineResult line = parseCommandLine(serviceCommandLine(options), arguments);
-    if (line.help) {
-        parsed.help = true;
+    if (line.help || line.version) {
+        parsed.help = line.help;
+        parsed.version = line.version;
         return parsed;
     }
     if (!line.error.empty()) {

@@ -6,8 +6,8 @@
 //             [--record FILE] | --list-devices
 //
 // Contract: parseServiceOptions reads the arguments after the program name with the one command-line parser
-// (core/platform/CommandLine.h: "--name value" or "--name=value", --help anywhere wins). It answers the
-// options, or help, or a one-line usage error: an unknown option or value, a missing value, a bad number,
+// (core/platform/CommandLine.h: "--name value" or "--name=value", --help anywhere wins, then --version).
+// It answers the options, or help, or the version, or a one-line usage error: an unknown option or value, a missing value, a bad number,
 // --speed with --fast, a source without its input, or an option that does not apply to the chosen source.
 // --list-devices asks for the listing of diagnostic ports instead of a service: it needs no source.
 #pragma once
@@ -44,6 +44,7 @@ struct ServiceOptions {
 struct ParsedServiceOptions {
     ServiceOptions options;
     bool help = false;
+    bool version = false;
     std::string error;  // a usage error when not empty
 };
 

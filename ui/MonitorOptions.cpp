@@ -73,10 +73,11 @@ ParsedMonitorOptions parseMonitorOptions(const std::vector<std::string>& argumen
     bool pathGiven = false;
     const CommandLineResult line = parseCommandLine(monitorCommandLine(parsed.options, pathGiven), arguments);
     parsed.help = line.help;
+    parsed.version = line.version;
     parsed.error = line.error;
     // --path only makes sense when the user asked for the headless front end, not when it is chosen for want
     // of a display or a terminal.
-    if (!parsed.help && parsed.error.empty() && pathGiven &&
+    if (!parsed.help && !parsed.version && parsed.error.empty() && pathGiven &&
         parsed.options.frontEnd != MonitorOptions::FrontEnd::Headless) {
         parsed.error = "--path goes with --headless";
     }

@@ -10,6 +10,7 @@
 #include <string_view>
 
 #include "LogGenerator/LogGenerator.h"
+#include "core/platform/BuildInfo.h"
 #include "core/platform/CommandLine.h"
 #include "core/platform/StandardOutputDiversion.h"
 #include "core/platform/SystemLog.h"
@@ -55,6 +56,10 @@ int main(int argc, char** argv) {
     const ParsedMonitorOptions parsed = parseMonitorOptions(commandLineArguments(argc, argv));
     if (parsed.help) {
         std::fputs(monitorUsage(kHaveGui, kHaveTerminal).c_str(), stdout);
+        return 0;
+    }
+    if (parsed.version) {
+        std::fputs(BuildInfo::versionText("velmar").c_str(), stdout);
         return 0;
     }
     if (!parsed.error.empty()) {

@@ -8,4 +8,10 @@ std::optional<std::string> BuildInfo::applicationVersion() { return std::string(
 
 std::string BuildInfo::buildDateTime() { return __DATE__ " " __TIME__; }
 
+std::string BuildInfo::versionText(std::string_view program) {
+    std::string text(program);
+    text.append(" ").append(VELMAR_VERSION_STRING).append(" (built ").append(buildDateTime()).append(")\n");
+    return text;
+}
+
 }  // namespace velmar

@@ -1,6 +1,7 @@
 #include "core/platform/CommandLine.h"
 
 #include <algorithm>
+#include <initializer_list>
 
 namespace velmar {
 
@@ -14,6 +15,8 @@ constexpr std::size_t kWidestHelpColumn = 30;  // a longer label puts its paragr
 constexpr std::string_view kHelpOption = "--help";
 constexpr std::string_view kHelpOptionShort = "-h";
 constexpr std::string_view kHelpParagraph = "show this help and exit";
+constexpr std::string_view kVersionOption = "--version";
+constexpr std::string_view kVersionParagraph = "show the version and build date and exit";
 constexpr std::string_view kEndOfOptions = "--";
 
 std::string worded(std::string_view wording, std::string_view argument) {
@@ -37,12 +40,14 @@ bool isOption(std::string_view argument) {
     return argument.size() > 1 && argument.front() == '-';
 }
 
-bool asksForHelp(const CommandLine& commandLine, const std::vector<std::string>& arguments) {
+// Whether one of `names` stands among the options, that is before a "--" that ends them.
+bool givenAmongOptions(const CommandLine& commandLine, const std::vector<std::string>& arguments,
+                       std::initializer_list<std::string_view> names) {
     for (const std::string& argument : arguments) {
         if (argument == kEndOfOptions && commandLine.takeOperand) {
             return false;
         }
-        if (argument == kHelpOption || argument == kHelpOptionShort) {
+        if (std::find(names.begin(), names.end(), argument) != names.end()) {
             return true;
         }
     }
@@ -153,8 +158,12 @@ CommandLineOption logStderrOption(bool& mirror) {
 CommandLineResult parseCommandLine(const CommandLine& commandLine,
                                    const std::vector<std::string>& arguments) {
     CommandLineResult result;
-    if (asksForHelp(commandLine, arguments)) {
+    if (givenAmongOptions(commandLine, arguments, {kHelpOption, kHelpOptionShort})) {
         result.help = true;
+        return result;
+    }
+    if (givenAmongOptions(commandLine, arguments, {kVersionOption})) {
+        result.version = true;
         return result;
     }
     const auto takeOperand = [&commandLine](std::string_view operand) {
@@ -257,6 +266,7 @@ std::string commandLineHelp(const CommandLine& commandLine) {
         entries.emplace_back(labelOf(option), option.help);
     }
     entries.emplace_back(std::string(kHelpOption), kHelpParagraph);
+    entries.emplace_back(std::string(kVersionOption), kVersionParagraph);
     std::size_t widest = 0;
     for (const auto& [label, help] : entries) {
         widest = std::max(widest, label.size());

@@ -6,6 +6,7 @@
 //
 // Contract of parseCommandLine, for every program alike:
 //   - "--help" or "-h" anywhere before a "--" wins over everything else on the line, errors included;
+//     after it, "--version" anywhere before a "--" does the same (the program prints BuildInfo::versionText);
 //   - an option's value follows it as "--name=value" or as the next argument "--name value"; an option
 //     that takes a value and has none (end of line, or an empty value) fails with "--name needs a value";
 //   - a flag given a value ("--flag=x") and an option that is not in the table are usage errors;
@@ -53,6 +54,7 @@ struct CommandLine {
 
 struct CommandLineResult {
     bool help = false;
+    bool version = false;
     std::string error;                    // the usage error; empty when the line was understood
     std::vector<std::string_view> given;  // the options given, spelled as in the table, in order
 };
@@ -70,7 +72,7 @@ CommandLineResult parseCommandLine(const CommandLine& commandLine, const std::ve
 std::vector<std::string> commandLineArguments(int argc, const char* const* argv);
 
 // The --help text, every line within 100 columns: the usage line (the rows' fragments, then the operands),
-// the description, every option with its help paragraph (and --help itself), then the epilogue.
+// the description, every option with its help paragraph (and --help and --version), then the epilogue.
 std::string commandLineHelp(const CommandLine& commandLine);
 
 }  // namespace velmar

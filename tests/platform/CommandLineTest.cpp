@@ -166,6 +166,25 @@ TEST(CommandLine, HelpWinsOverEverythingElse) {
     EXPECT_EQ(sample.speed, "");
 }
 
+TEST(CommandLine, VersionWinsOverEverythingButHelp) {
+    Sample sample;
+    const CommandLine commandLine = sampleCommandLine(sample, true);
+    for (const std::vector<std::string>& arguments : std::vector<std::vector<std::string>>{
+             {"--version"}, {"--bogus", "--version"}, {"--speed", "0", "--version"}, {"a.hex", "--version"}}) {
+        const CommandLineResult result = parseCommandLine(commandLine, arguments);
+        EXPECT_TRUE(result.version) << arguments.front();
+        EXPECT_FALSE(result.help) << arguments.front();
+        EXPECT_EQ(result.error, "") << arguments.front();
+    }
+    const CommandLineResult both = parseCommandLine(commandLine, {"--version", "--help"});
+    EXPECT_TRUE(both.help);
+    EXPECT_FALSE(both.version);
+    // After "--" it is an operand like any other.
+    const CommandLineResult operand = parseCommandLine(commandLine, {"--", "--version"});
+    EXPECT_FALSE(operand.version);
+    EXPECT_EQ(sample.operands, (std::vector<std::string>{"--version"}));
+}
+
 TEST(CommandLine, HelpIsGeneratedFromTheTable) {
     Sample sample;
     EXPECT_EQ(commandLineHelp(sampleCommandLine(sample, true)),
@@ -178,6 +197,7 @@ TEST(CommandLine, HelpIsGeneratedFromTheTable) {
               "  --fast        as fast as possible\n"
               "  --loop        start again at the end\n"
               "  --help        show this help and exit\n"
+              "  --version     show the version and build date and exit\n"
               "\n"
               "Exit status 2: usage error.\n");
 }

@@ -100,8 +100,9 @@ std::optional<DecodeOptions> parseDecodeOptions(const std::vector<std::string>& 
                                                 std::string& error) {
     DecodeOptions options;
     const CommandLineResult line = parseCommandLine(decodeCommandLine(options), arguments);
-    if (line.help) {
-        options.help = true;
+    if (line.help || line.version) {
+        options.help = line.help;
+        options.version = line.version;
         return options;
     }
     if (!line.error.empty()) {

@@ -22,6 +22,7 @@ struct DecodeOptions {
     bool startCommand = false;
     bool logStderr = false;
     bool help = false;
+    bool version = false;
     std::vector<std::string> files;
 };
 

@@ -10,6 +10,7 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/StateKeys.h"
+#include "core/platform/BuildInfo.h"
 #include "core/platform/CommandLine.h"
 #include "core/platform/Json.h"
 #include "core/platform/StandardOutputDiversion.h"
@@ -137,6 +138,10 @@ int main(int argc, char** argv) {
     }
     if (options->help) {
         std::fputs(decodeUsage().c_str(), stdout);
+        return 0;
+    }
+    if (options->version) {
+        std::fputs(BuildInfo::versionText("velmar-decode").c_str(), stdout);
         return 0;
     }
     SystemLog::setMirrorToStderr(options->logStderr);
