@@ -3,13 +3,15 @@ SHELL := /bin/bash
 .DEFAULT_GOAL := build
 
 # The Debian packages the project builds and tests with.
+# lintian checks the .deb; systemd brings systemd-analyze, which checks the user unit.
 DEBIAN_PACKAGES := build-essential cmake pkg-config clang libclang-rt-14-dev qt6-base-dev libexpat1-dev \
-                   libncurses-dev googletest libgtest-dev libbenchmark-dev tmux
+                   libncurses-dev googletest libgtest-dev libbenchmark-dev tmux lintian systemd
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 FUZZ_SECONDS ?= 30
 DEMO_TECHNOLOGY ?= lte
 
-.PHONY: deps build build-asan build-fuzz test test-default test-asan fuzz bench demo format clean
+.PHONY: deps build build-asan build-fuzz test test-default test-asan fuzz package package-check bench demo format \
+        clean
 
 deps:
 	@missing=""; \
@@ -53,7 +55,18 @@ fuzz: build-fuzz
 	  rm -rf "$$scratch" "$$log"; \
 	done
 
-test: test-default test-asan fuzz
+# The .deb from the default build (no second build): build/package/velmar_<version>_<arch>.deb.
+package: build
+	rm -rf build/package
+	cpack --config build/default/CPackConfig.cmake -B build/package
+	@rm -rf build/package/_CPack_Packages
+	@for deb in build/package/*.deb; do echo "$$deb: $$(du -k "$$deb" | cut -f1) KiB"; done
+
+# lintian on the package: errors and warnings fail; informational tags are shown.
+package-check: package
+	lintian --fail-on error,warning --display-info build/package/*.deb
+
+test: test-default package-check test-asan fuzz
 
 bench: build
 	@for program in build/default/bench/bench_*; do [ -x "$$program" ] && "$$program"; done

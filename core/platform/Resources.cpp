@@ -31,7 +31,7 @@ std::vector<std::string> Resources::searchDirectories() {
         candidates.emplace_back(overridden);
     }
     if (const std::string exeDir = executableDirectory(); !exeDir.empty()) {
-        candidates.push_back(exeDir + "/../share/velmar/templates");
+        candidates.push_back(exeDir + "/" VELMAR_TEMPLATE_DIR_FROM_BINDIR);
     }
     candidates.emplace_back(VELMAR_INSTALLED_TEMPLATE_DIR);
     candidates.emplace_back(VELMAR_SOURCE_TEMPLATE_DIR);
