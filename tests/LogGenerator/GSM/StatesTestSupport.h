@@ -42,7 +42,9 @@ inline std::string textAt(const PlistDictionary& dictionary, std::string_view ke
     if (const std::string* text = value->string()) {
         return *text;
     }
-    return std::string("<") + std::string(value->typeName()) + ">";
+    std::string marker(1, '<');
+    marker.append(value->typeName()).push_back('>');
+    return marker;
 }
 
 // The keys of a dictionary or of a class index's dictionary, in their order.
