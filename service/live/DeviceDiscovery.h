@@ -21,8 +21,8 @@ struct CandidatePort {
     std::string tty;         // "ttyUSB0"
     std::string devicePath;  // "/dev/ttyUSB0" (under the root)
     std::string byIdPath;    // "/dev/serial/by-id/usb-...-if00-port0", or empty
-    std::string vendor;      // "05c6" (idVendor), or empty
-    std::string product;     // "9091" (idProduct), or empty
+    std::string vendor;      // "abcd" (idVendor), or empty
+    std::string product;     // "0002" (idProduct), or empty
     int interfaceNumber = -1;
     int interfaceClass = -1;
     int interfaceSubClass = -1;
@@ -34,7 +34,7 @@ std::string deviceRoot();
 
 std::vector<CandidatePort> findCandidatePorts(const std::string& root);
 
-// "ttyUSB0  /dev/serial/by-id/...  05c6:9091  interface 0 (ff/ff/30)" without the verdict.
+// "ttyUSB0  /dev/serial/by-id/...  abcd:0002  interface 0 (ff/ff/30)" without the verdict.
 std::string describeCandidate(const CandidatePort& port);
 
 }  // namespace velmar::live

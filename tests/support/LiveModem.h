@@ -29,8 +29,8 @@ class FakeSysfs {
         int interfaceClass = 0xFF;
         int interfaceSubClass = 0xFF;
         int interfaceProtocol = 0xFF;
-        std::string vendor = "05c6";
-        std::string product = "9091";
+        std::string vendor = "abcd";
+        std::string product = "0002";
         std::string byId;  // empty: no by-id link
     };
     void addUsbSerialPort(const UsbPort& port);

@@ -191,7 +191,7 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
     const Codes lteCodes = {0xB0C1, 0xB0C2, 0xB179, 0xB17F, 0xB180, 0xB186};
     testing::TemporaryDirectory root;
     testing::FakeSysfs sysfs(root.path());
-    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0x30, "05c6", "90db", "usb-Maker_Modem_7-if00-port0"});
+    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0x30, "abcd", "0003", "usb-Maker_Modem_7-if00-port0"});
     testing::ModemEmulator::Settings settings;
     settings.capturePath = std::string(VELMAR_SOURCE_DIR) + "/samples/captures/lte-connected-1.qmdl";
     settings.linkPath = sysfs.devicePath("ttyUSB0");

@@ -13,8 +13,8 @@ namespace {
 TEST(DeviceDiscovery, FindsVendorSpecificUsbSerialPortsMostLikelyFirst) {
     testing::TemporaryDirectory root;
     testing::FakeSysfs sysfs(root.path());
-    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0xFF, "1199", "9071", "usb-Maker_Modem_1-if00-port0"});
-    sysfs.addUsbSerialPort({"ttyUSB1", 2, 0xFF, 0x00, 0x00, "1199", "9071", "usb-Maker_Modem_1-if02-port0"});
+    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0xFF, "abcd", "0001", "usb-Maker_Modem_1-if00-port0"});
+    sysfs.addUsbSerialPort({"ttyUSB1", 2, 0xFF, 0x00, 0x00, "abcd", "0001", "usb-Maker_Modem_1-if02-port0"});
     sysfs.addUsbSerialPort({"ttyUSB2", 3, 0xFF, 0xFF, 0x30, "2c7c", "0800", ""});
     sysfs.addUsbSerialPort({"ttyACM0", 1, 0x02, 0x02, 0x01, "1bc7", "1201", ""});  // a CDC modem's AT port
     sysfs.addPlainTty("ttyS0");
@@ -27,13 +27,13 @@ TEST(DeviceDiscovery, FindsVendorSpecificUsbSerialPortsMostLikelyFirst) {
     EXPECT_EQ(ports[0].devicePath, root.path() + "/dev/ttyUSB2");
     EXPECT_EQ(ports[0].byIdPath, "");
     EXPECT_EQ(ports[1].byIdPath, root.path() + "/dev/serial/by-id/usb-Maker_Modem_1-if00-port0");
-    EXPECT_EQ(ports[1].vendor, "1199");
-    EXPECT_EQ(ports[1].product, "9071");
+    EXPECT_EQ(ports[1].vendor, "abcd");
+    EXPECT_EQ(ports[1].product, "0001");
     EXPECT_EQ(ports[2].interfaceNumber, 2);
     EXPECT_EQ(ports[0].interfaceProtocol, 0x30);
     EXPECT_EQ(describeCandidate(ports[1]),
               root.path() + "/dev/ttyUSB0  " + root.path() +
-                  "/dev/serial/by-id/usb-Maker_Modem_1-if00-port0  1199:9071  interface 0 (ff/ff/ff)");
+                  "/dev/serial/by-id/usb-Maker_Modem_1-if00-port0  abcd:0001  interface 0 (ff/ff/ff)");
     EXPECT_EQ(describeCandidate(ports[0]),
               root.path() + "/dev/ttyUSB2  -  2c7c:0800  interface 3 (ff/ff/30)");
 }

@@ -456,7 +456,7 @@ TEST_F(LiveModemTest, AutoTakesTheFirstCandidateThatAnswers) {
     FakeSysfs sysfs(root.path());
     // The most likely candidate stays silent; the next one is the modem.
     sysfs.addUsbSerialPort({"ttyUSB3", 3, 0xFF, 0xFF, 0x30, "2c7c", "0800", ""});
-    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0xFF, "05c6", "9091", "usb-Maker_Modem_42-if00-port0"});
+    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0xFF, "abcd", "0002", "usb-Maker_Modem_42-if00-port0"});
     ModemEmulator silent(ModemEmulator::Settings{"", 0, sysfs.devicePath("ttyUSB3"), {}, false, false});
     std::string error;
     ASSERT_TRUE(silent.start(error)) << error;
@@ -473,7 +473,7 @@ TEST_F(LiveModemTest, AutoTakesTheFirstCandidateThatAnswers) {
     ASSERT_TRUE(runUntil([&] { return client.blobs().size() >= 10; }));
     EXPECT_TRUE(
         service.waitForError("<5> live: auto: using " + sysfs.devicePath("ttyUSB0") + "  " + root.path() +
-                             "/dev/serial/by-id/usb-Maker_Modem_42-if00-port0  05c6:9091  interface 0 "
+                             "/dev/serial/by-id/usb-Maker_Modem_42-if00-port0  abcd:0002  interface 0 "
                              "(ff/ff/ff)\n"))
         << service.errorOutput();
     EXPECT_EQ(hexesOf(silent.requests()), (std::vector<std::string>{"00", "00"}));
@@ -484,8 +484,8 @@ TEST_F(LiveModemTest, ListDevicesProbesEveryCandidate) {
     TemporaryDirectory root;
     FakeSysfs sysfs(root.path());
     sysfs.addUsbSerialPort({"ttyUSB2", 4, 0xFF, 0xFF, 0x30, "2c7c", "0800", "usb-Quick_Module-if04-port0"});
-    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0xFF, "1199", "9071", ""});
-    sysfs.addUsbSerialPort({"ttyUSB1", 2, 0xFF, 0x00, 0x00, "1199", "9071", ""});
+    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0xFF, "abcd", "0001", ""});
+    sysfs.addUsbSerialPort({"ttyUSB1", 2, 0xFF, 0x00, 0x00, "abcd", "0001", ""});
     sysfs.addUsbSerialPort({"ttyACM0", 0, 0x02, 0x02, 0x01, "1bc7", "1201", ""});
     ModemEmulator& modem = startModem(
         "", 0, [&](ModemEmulator::Settings& settings) { settings.linkPath = sysfs.devicePath("ttyUSB2"); });
@@ -502,8 +502,8 @@ TEST_F(LiveModemTest, ListDevicesProbesEveryCandidate) {
     EXPECT_EQ(result.out,
               dev + "ttyUSB2  " + dev +
                   "serial/by-id/usb-Quick_Module-if04-port0  2c7c:0800  interface 4 (ff/ff/30)  answers\n" +
-                  dev + "ttyUSB0  -  1199:9071  interface 0 (ff/ff/ff)  silent\n" + dev +
-                  "ttyUSB1  -  1199:9071  interface 2 (ff/00/00)  cannot open: No such file or directory\n");
+                  dev + "ttyUSB0  -  abcd:0001  interface 0 (ff/ff/ff)  silent\n" + dev +
+                  "ttyUSB1  -  abcd:0001  interface 2 (ff/00/00)  cannot open: No such file or directory\n");
     EXPECT_EQ(result.err, "");
     EXPECT_EQ(hexesOf(modem.requests()), std::vector<std::string>{"00"}) << "a probe and nothing else";
     EXPECT_TRUE(modem.enabledCodes().empty());
