@@ -15,6 +15,7 @@
 #include "service/KxServer.h"
 #include "service/ServiceOptions.h"
 #include "service/SourceFactory.h"
+#include "service/VersionAdaptingSink.h"
 #include "service/live/PortListing.h"
 
 namespace velmar {
@@ -33,13 +34,15 @@ int cannotStart(const std::string& message) {
     return kExitCannotStart;
 }
 
-// SIGTERM and SIGINT arrive as readable data on a descriptor that the main queue watches, so that the
-// shutdown runs as an ordinary queue callback. Answers -1 when that cannot be arranged.
-int openTerminationSignals() {
+// SIGTERM and SIGINT (stop) and SIGUSR1 (log the version census) arrive as readable data on a descriptor
+// that the main queue watches, so that they are handled by ordinary queue callbacks. Answers -1 when that
+// cannot be arranged.
+int openServiceSignals() {
     sigset_t signals;
     sigemptyset(&signals);
     sigaddset(&signals, SIGTERM);
     sigaddset(&signals, SIGINT);
+    sigaddset(&signals, SIGUSR1);
     if (sigprocmask(SIG_BLOCK, &signals, nullptr) != 0) {
         return -1;
     }
@@ -80,13 +83,15 @@ int runKxServerd(int argc, char** argv) {
         std::fprintf(stderr, "%s: %s\n", kProgramName, error.c_str());
         return kExitUsage;
     }
-    const int signals = openTerminationSignals();
+    const int signals = openServiceSignals();
     if (signals < 0) {
-        return cannotStart("cannot watch for SIGTERM and SIGINT");
+        return cannotStart("cannot watch for SIGTERM, SIGINT and SIGUSR1");
     }
     PollMainQueue queue;
     MainQueue::setCurrent(&queue);
     KxServer server(queue, options.technology, options.objectBased);
+    // Every source's blobs enter the channels through the version adapter.
+    VersionAdaptingSink adaptingSink(server);
     switch (server.open()) {
         case KxServer::OpenResult::Serving:
             break;
@@ -116,7 +121,11 @@ int runKxServerd(int argc, char** argv) {
     const MainQueue::Handle signalWatch = queue.watchReadable(signals, [&] {
         signalfd_siginfo info{};
         while (read(signals, &info, sizeof info) == static_cast<ssize_t>(sizeof info)) {
-            stoppedBy = static_cast<int>(info.ssi_signo);
+            if (info.ssi_signo == SIGUSR1) {
+                adaptingSink.logCensus();
+            } else {
+                stoppedBy = static_cast<int>(info.ssi_signo);
+            }
         }
         if (stoppedBy == 0) {
             return;
@@ -135,10 +144,11 @@ int runKxServerd(int argc, char** argv) {
     SystemLog::log(kLogNotice, "kxserverd: serving %s on port %s; source: %s",
                    std::string(options.technology).c_str(), std::string(kKxServerControlPortName).c_str(),
                    source->description().c_str());
-    source->start(queue, server);
+    source->start(queue, adaptingSink);
     queue.run();
 
     source->stop();
+    adaptingSink.logCensus();
     server.shutdown();
     queue.unwatch(signalWatch);
     close(signals);

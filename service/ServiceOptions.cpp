@@ -114,6 +114,9 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
             "codes and extra codes it receives.",
         .options = {},
         .epilogue =
+            "Records of newer firmware versions are rewritten into the layouts the monitor decodes before "
+            "the channels' log-code filters; SIGUSR1 logs the census of record versions seen (notice "
+            "priority), as does the exit. "
             "SIGTERM or SIGINT closes every channel and the control port and exits with status 0. Exit "
             "status 1: the service could not start (another kxserverd is already running, unreadable "
             "input, device that cannot be opened or does not answer a version request); 2: usage error.",

@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "core/platform/KxServerProtocol.h"
+#include "logfile/PacketVersionAdapter.h"
 #include "logfile/records/GsmRecords.h"
 #include "logfile/records/LteRecords.h"
 #include "service/sim/SimCardFiles.h"
@@ -19,7 +20,6 @@ constexpr double kResourceBlocks = 100.0;
 // Thermal noise over 18 MHz with a 7 dB noise figure.
 constexpr double kNoiseDbm = -94.4;
 constexpr int kQrxlevminDbm = -124;
-constexpr std::uint8_t kVersion = 4;
 constexpr std::size_t kMaxIdleNeighbours = 8;
 constexpr std::size_t kMaxMeasured = 6;
 constexpr std::size_t kMaxDetected = 3;
@@ -28,6 +28,12 @@ constexpr std::size_t kMaxDetected = 3;
 constexpr std::size_t kMaxCandidates = 1;
 constexpr std::size_t kMaxMonitorNeighbours = 6;
 constexpr double kAverageWeight = 0.3;  // layer-3 filter of the averaged levels, per report
+
+// The records are written in the layouts the decoders read, with those layouts' version numbers, so that
+// the service's version adapter passes them on as they are.
+std::uint8_t decodedVersion(std::uint16_t code) {
+    return static_cast<std::uint8_t>(decodedLayoutVersion(code));
+}
 
 double toLinear(double dbm) {
     return std::pow(10.0, dbm / 10.0);
@@ -143,7 +149,7 @@ void LteEmitter::step(const RadioSnapshot& snapshot, const BlobOutput& emit) {
 void LteEmitter::emitServingCellInfo(const RadioSnapshot& snapshot, const BlobOutput& emit) {
     const SimCell& cell = snapshot.cells[static_cast<std::size_t>(snapshot.servingCell)];
     LteServingCellInfoRecord info;
-    info.version = 1;
+    info.version = decodedVersion(kLteServingCellInfoCode);
     info.physicalCellId = static_cast<std::uint16_t>(cell.physicalId);
     info.downlinkEarfcn = static_cast<std::uint16_t>(cell.channel);
     info.uplinkEarfcn = static_cast<std::uint16_t>(cell.channel + 18000);  // the band's duplex spacing
@@ -156,7 +162,7 @@ void LteEmitter::emitServingCellInfo(const RadioSnapshot& snapshot, const BlobOu
     send(buildLteServingCellInfoRecord(info, snapshot.basebandTimestamp), emit);
 
     LteMasterInformationRecord master;
-    master.version = 1;
+    master.version = decodedVersion(kLteMasterInformationCode);
     master.physicalCellId = info.physicalCellId;
     master.earfcn = info.downlinkEarfcn;
     master.numTxAntennas = 2;
@@ -168,7 +174,7 @@ void LteEmitter::emitIntraFrequency(const RadioSnapshot& snapshot, const BlobOut
     const SimCell& cell = snapshot.cells[static_cast<std::size_t>(snapshot.servingCell)];
     const CellLevels& serving = levels_[static_cast<std::size_t>(snapshot.servingCell)];
     LteIntraFrequencyRecord record;
-    record.version = kVersion;
+    record.version = decodedVersion(kLteIntraFrequencyCode);
     record.earfcn = static_cast<std::uint16_t>(cell.channel);
     record.servingPhysicalCellId = static_cast<std::uint16_t>(cell.physicalId);
     // System frame number × 10 + subframe, which wraps at 10240 ms.
@@ -212,7 +218,7 @@ void LteEmitter::emitIdleServing(const RadioSnapshot& snapshot, const BlobOutput
     const double srxlev = serving.rsrp - kQrxlevminDbm;
 
     LteIdleServingMeasurementRecord record;
-    record.version = kVersion;
+    record.version = decodedVersion(kLteIdleServingMeasurementCode);
     record.earfcn = static_cast<std::uint16_t>(cell.channel);
     record.physicalCellId = static_cast<std::uint16_t>(cell.physicalId);
     record.servingLayerPriority = 5;
@@ -238,7 +244,7 @@ void LteEmitter::emitIdleNeighbours(const RadioSnapshot& snapshot, const BlobOut
     measure(snapshot);
     const SimCell& cell = snapshot.cells[static_cast<std::size_t>(snapshot.servingCell)];
     LteIdleNeighbourMeasurementRecord record;
-    record.version = kVersion;
+    record.version = decodedVersion(kLteIdleNeighbourMeasurementCode);
     record.earfcn = static_cast<std::uint16_t>(cell.channel);
     record.qrxlevmin = static_cast<std::uint8_t>((kQrxlevminDbm + 140) / 2);
     for (const HeardCell& heard : snapshot.heard) {

@@ -6,6 +6,7 @@
 #include "core/platform/TelephonyServiceConnection.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/LogFormat.h"
+#include "logfile/PacketVersionAdapter.h"
 
 namespace velmar::testing {
 
@@ -129,6 +130,21 @@ std::vector<PlistData> blobsOfFile(const std::string& path) {
     for (const LogItem& item : readLogFile(path).items) {
         if (item.isBlob()) {
             blobs.push_back(item.bytes);
+        }
+    }
+    return blobs;
+}
+
+std::vector<PlistData> adaptedBlobsOfFile(const std::string& path) {
+    return adaptedBlobs(blobsOfFile(path));
+}
+
+std::vector<PlistData> adaptedBlobs(std::vector<PlistData> blobs) {
+    PacketVersionAdapter adapter;
+    for (PlistData& blob : blobs) {
+        const ByteView adapted = adapter.adapt(blob).blob;
+        if (adapted.data() != blob.data()) {
+            blob.assign(adapted.begin(), adapted.end());
         }
     }
     return blobs;

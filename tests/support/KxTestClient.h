@@ -59,6 +59,9 @@ class KxTestClient {
 
 // The blobs of a recorded log file, ticks left out.
 std::vector<PlistData> blobsOfFile(const std::string& path);
+// Blobs as the service hands them on: through the packet-version adapter.
+std::vector<PlistData> adaptedBlobs(std::vector<PlistData> blobs);
+std::vector<PlistData> adaptedBlobsOfFile(const std::string& path);
 // The distinct codes of ordinary log packets among blobs (no channel prefix), ascending.
 std::vector<std::int64_t> codesOf(const std::vector<PlistData>& blobs);
 // A blob as spaced lowercase hex, for readable failures.

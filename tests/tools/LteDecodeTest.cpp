@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "logfile/LogFormat.h"
+#include "logfile/PacketVersionAdapter.h"
 #include "tests/support/Json.h"
 #include "tests/support/Process.h"
 #include "tests/support/TestPaths.h"
@@ -161,16 +162,20 @@ unsigned u16At(const std::vector<std::uint8_t>& packet, std::size_t offset) {
     return offset + 1 < packet.size() ? packet[offset] | (packet[offset + 1] << 8) : 0;
 }
 
-ExpectedLte expectedFromCapture(const std::string& path) {
+// What the decoders must show of a capture, read straight off its records (adapted to the decoded layouts
+// first unless rawVersions).
+ExpectedLte expectedFromCapture(const std::string& path, bool rawVersions) {
     ExpectedLte expected;
     std::string error;
+    PacketVersionAdapter adapter;
     const bool read = forEachLogItem(
         path, LogFormat::DiagCapture,
         [&](const LogItemView& item) {
             if (!item.isBlob() || item.bytes.size() < 13 || item.bytes[0] != 1) {
                 return true;
             }
-            const std::vector<std::uint8_t> packet(item.bytes.begin(), item.bytes.end());
+            const ByteView bytes = rawVersions ? item.bytes : adapter.adapt(item.bytes).blob;
+            const std::vector<std::uint8_t> packet(bytes.begin(), bytes.end());
             const unsigned code = u16At(packet, 3);
             switch (code) {
                 case 0xB179:
@@ -215,11 +220,12 @@ ExpectedLte expectedFromCapture(const std::string& path) {
     return expected;
 }
 
-void checkCapture(const std::string& name) {
+void checkCapture(const std::string& name, bool rawVersions) {
     const std::string path = capturePath(name);
-    const ExpectedLte expected = expectedFromCapture(path);
+    const ExpectedLte expected = expectedFromCapture(path, rawVersions);
     EXPECT_GT(expected.records, 0u) << name;
-    const PlistValue display = decode({kDecode, "--technology", "lte", path});
+    const PlistValue display = rawVersions ? decode({kDecode, "--technology", "lte", "--raw-versions", path})
+                                           : decode({kDecode, "--technology", "lte", path});
     ASSERT_TRUE(display.isDictionary()) << name;
     EXPECT_EQ(lengthOf(at(display, {"Neighbor Cells", "Measured Neighbor Cells"})), expected.measured)
         << name;
@@ -239,11 +245,16 @@ void checkCapture(const std::string& name) {
 }
 
 TEST(LteDecode, ConnectedModeCaptureGoesThroughWithListsOfTheirCounts) {
-    checkCapture("lte-connected-1.qmdl");
+    checkCapture("lte-connected-1.qmdl", false);
 }
 
 TEST(LteDecode, MultiSubscriptionCaptureGoesThroughWithListsOfTheirCounts) {
-    checkCapture("multisim-1.qmdl");
+    checkCapture("multisim-1.qmdl", false);
+}
+
+TEST(LteDecode, RawVersionsDecodeTheRecordsAsRecorded) {
+    checkCapture("lte-connected-1.qmdl", true);
+    checkCapture("multisim-1.qmdl", true);
 }
 
 }  // namespace

@@ -80,6 +80,17 @@ CommandLine decodeCommandLine(DecodeOptions& options) {
          .value = "",
          .help = "print the snapshot save contents (history entries and DLF file) instead",
          .apply = setsFlag(options.saveContents)},
+        {.name = "--raw-versions",
+         .value = "",
+         .help = "decode records as recorded: without this, records of newer firmware versions are first "
+                 "rewritten into the layouts the decoders read",
+         .apply = setsFlag(options.rawVersions)},
+        {.name = "--census",
+         .value = "",
+         .help = "print, instead of the display, one line per log code and record version with how many "
+                 "records were decoded as is, adapted, dropped, of an unknown version or not decoded by the "
+                 "technology (its codes first), e.g. '0xB179 v4 237 adapted'",
+         .apply = setsFlag(options.census)},
         {.name = "--start-command",
          .value = "",
          .help = "print the generator's start command and exit (no FILE needed)",

@@ -1,21 +1,29 @@
-// velmar-decode: feeds recorded baseband blobs through a technology's generator, exactly as the monitor's
-// model does, and prints the display (or the whole state, or the save contents) as JSON.
+// velmar-decode: feeds recorded baseband blobs through the packet-version adapter and a technology's
+// generator, exactly as the service and the monitor's model do, and prints the display (or the whole state,
+// or the save contents) as JSON, or the adapter's census.
 //
-// Standard output carries JSON only (StandardOutputDiversion): the generator family's own lines go to
+// Standard output carries that only (StandardOutputDiversion): the generator family's own lines go to
 // standard error with --log-stderr, like the log lines, and nowhere otherwise, so that a failure prints one
 // line only.
 #include <cstdio>
 #include <memory>
+#include <set>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/StateKeys.h"
+#include "core/platform/BasebandPacket.h"
 #include "core/platform/BuildInfo.h"
 #include "core/platform/CommandLine.h"
 #include "core/platform/Json.h"
+#include "core/platform/KxServerProtocol.h"
 #include "core/platform/StandardOutputDiversion.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/LogFormat.h"
+#include "logfile/PacketCensus.h"
+#include "logfile/PacketVersionAdapter.h"
 #include "tools/decode/DecodeOptions.h"
 
 namespace velmar {
@@ -24,14 +32,23 @@ namespace {
 constexpr int kExitUsageOrInput = 2;
 constexpr int kPrettyIndent = 2;
 
-class JsonOutput {
+// Standard output: JSON documents, or the census's lines.
+class StandardOutput {
   public:
-    explicit JsonOutput(bool diagnosticsToStderr) : diversion_(diagnosticsToStderr) {}
+    explicit StandardOutput(bool diagnosticsToStderr) : diversion_(diagnosticsToStderr) {}
 
     void write(const PlistValue& value, int indent) {
         std::string text = plistToJson(value, indent);
         text.push_back('\n');
         std::fwrite(text.data(), 1, text.size(), diversion_.stream());
+        std::fflush(diversion_.stream());
+    }
+
+    void writeLines(const std::vector<std::string>& lines) {
+        for (const std::string& line : lines) {
+            std::fputs(line.c_str(), diversion_.stream());
+            std::fputc('\n', diversion_.stream());
+        }
         std::fflush(diversion_.stream());
     }
 
@@ -65,8 +82,28 @@ void reportCaptureStatistics(const std::string& path, const LogReadStats& stats)
     }
 }
 
+// Whether the generator's start command subscribes to a log code (extra codes count from 0xFF0000).
+DecodedCodes codesOfStartCommand(const PlistValue& command) {
+    auto codes = std::make_shared<std::set<std::int32_t>>();
+    if (const PlistDictionaryRef dictionary = command.dictionary()) {
+        for (const auto& [key, base] :
+             {std::pair{kKxSetLogCodesKey, 0}, std::pair{kKxSetExtraCodesKey, kExtendedCodeBase}}) {
+            const PlistValue list = dictionary->get(std::string(key));
+            if (!list.isArray()) {
+                continue;
+            }
+            for (const PlistValue& code : *list.array()) {
+                if (const auto value = code.integerValue()) {
+                    codes->insert(static_cast<std::int32_t>(*value + base));
+                }
+            }
+        }
+    }
+    return [codes](std::int32_t logCode) { return codes->contains(logCode); };
+}
+
 int run(const DecodeOptions& options) {
-    JsonOutput json(options.logStderr);
+    StandardOutput json(options.logStderr);
     std::unique_ptr<LogGenerator> generator =
         LogGenerator::generatorFromTechnology(options.technologyConstant);
     if (!generator) {
@@ -89,16 +126,28 @@ int run(const DecodeOptions& options) {
         }
     };
 
+    // Every blob passes the packet-version adapter on its way to the generator, as in the service.
+    PacketVersionAdapter adapter;
+    PacketCensus census;
+    auto intake = [&](ByteView blob) {
+        if (options.census) {
+            census.add(adapter.adapt(blob));
+        } else if (options.rawVersions) {
+            generator->updateState(state, blob);
+        } else {
+            generator->updateState(state, adapter.adapt(blob).blob);
+        }
+    };
     for (const std::string& path : options.files) {
         std::string error;
         LogReadStats stats;
         const bool read = forEachLogItem(
             path, options.format,
             [&](const LogItemView& item) {
-                if (item.isTick()) {
+                if (!item.isTick()) {
+                    intake(item.bytes);
+                } else if (!options.census) {
                     refresh();
-                } else {
-                    generator->updateState(state, item.bytes);
                 }
                 return true;
             },
@@ -107,6 +156,10 @@ int run(const DecodeOptions& options) {
         if (!read) {
             return fail(error);
         }
+    }
+    if (options.census) {
+        json.writeLines(censusReport(census, codesOfStartCommand(generator->getStartCommand())));
+        return 0;
     }
     refresh();
 
