@@ -11,7 +11,6 @@
 #include "core/ArrayLock.h"
 #include "core/VelmarModelNode.h"
 #include "core/platform/SystemLog.h"
-#include "logfile/LogFormat.h"
 
 namespace velmar {
 namespace {
@@ -38,18 +37,7 @@ class BenchGenerator : public ORVLogGenerator2 {
 };
 
 const std::vector<PlistData>& captureBlobs() {
-    static const std::vector<PlistData> blobs = [] {
-        std::vector<PlistData> out;
-        const LogReadResult result =
-            readLogFile(std::string(VELMAR_SOURCE_DIR) + "/samples/captures/mixed-large-1.qmdl");
-        for (const LogItem& item : result.items) {
-            if (item.isBlob()) {
-                out.push_back(item.bytes);
-            }
-        }
-        return out;
-    }();
-    return blobs;
+    return bench::mixedCaptureBlobs();
 }
 
 // Framing and dispatch alone: what runs per packet before any decoder.

@@ -1,7 +1,7 @@
 #include "logfile/PacketVersionAdapter.h"
 
 #include <algorithm>
-#include <bitset>
+#include <array>
 #include <limits>
 
 #include "core/platform/BasebandPacket.h"
@@ -10,6 +10,53 @@
 
 namespace velmar {
 
+namespace packet_versions {
+
+// The few codes with known layouts, found by one probe of a small open-addressed table in the common case:
+// most packets are of other codes, and rejecting them must cost next to nothing.
+class KnownCodes {
+  public:
+    KnownCodes() {
+        for (const auto group : {lteCodeVersions(), otherCodeVersions()}) {
+            for (const CodeVersions& code : group) {
+                std::size_t slot = slotOf(code.code);
+                while (slots_[slot] != nullptr) {
+                    slot = (slot + 1) % kSlots;
+                }
+                slots_[slot] = &code;
+            }
+        }
+    }
+    const CodeVersions* find(std::uint16_t code) const {
+        for (std::size_t slot = slotOf(code);; slot = (slot + 1) % kSlots) {
+            const CodeVersions* known = slots_[slot];
+            if (known == nullptr || known->code == code) {
+                return known;
+            }
+        }
+    }
+
+    // Bit n set: some known code lies in slot n.
+    std::uint64_t slots() const {
+        std::uint64_t used = 0;
+        for (const CodeVersions* known : slots_) {
+            if (known != nullptr) {
+                used |= std::uint64_t{1} << slotOf(known->code);
+            }
+        }
+        return used;
+    }
+
+  private:
+    // Several times the number of known codes, so that probes stay short and one slot is always free.
+    static constexpr std::size_t kSlots = 64;
+    static std::size_t slotOf(std::uint16_t code) { return knownCodeSlot(code); }
+
+    std::array<const CodeVersions*, kSlots> slots_{};
+};
+
+}  // namespace packet_versions
+
 namespace {
 
 using packet_versions::CodeVersions;
@@ -17,36 +64,6 @@ using packet_versions::VersionPlace;
 using packet_versions::VersionTable;
 
 constexpr unsigned kTopBitsShift = 6;
-
-// The few codes with known layouts, and a bit per code so that the many others cost one test.
-class KnownCodes {
-  public:
-    KnownCodes() {
-        for (const auto group : {packet_versions::lteCodeVersions(), packet_versions::otherCodeVersions()}) {
-            for (const CodeVersions& code : group) {
-                codes_.push_back(&code);
-                known_.set(code.code);
-            }
-        }
-    }
-    const CodeVersions* find(std::uint16_t code) const {
-        if (!known_.test(code)) {
-            return nullptr;
-        }
-        const auto found = std::find_if(codes_.begin(), codes_.end(),
-                                        [code](const CodeVersions* c) { return c->code == code; });
-        return found == codes_.end() ? nullptr : *found;
-    }
-
-  private:
-    std::bitset<std::numeric_limits<std::uint16_t>::max() + 1> known_;
-    std::vector<const CodeVersions*> codes_;
-};
-
-const KnownCodes& knownCodes() {
-    static const KnownCodes codes;
-    return codes;
-}
 
 std::int16_t recordedVersion(const CodeVersions& code, ByteView payload) {
     if (code.place == VersionPlace::None || payload.empty()) {
@@ -69,6 +86,11 @@ const VersionTable* tableFor(const CodeVersions& code, std::int16_t version, con
     return nullptr;
 }
 
+const packet_versions::KnownCodes& knownCodes() {
+    static const packet_versions::KnownCodes codes;
+    return codes;
+}
+
 }  // namespace
 
 std::int16_t decodedLayoutVersion(std::uint16_t code) {
@@ -76,7 +98,10 @@ std::int16_t decodedLayoutVersion(std::uint16_t code) {
     return known == nullptr || known->decodedVersion < 0 ? kNoVersion : known->decodedVersion;
 }
 
-AdaptedPacket PacketVersionAdapter::adapt(ByteView blob) {
+PacketVersionAdapter::PacketVersionAdapter()
+    : knownCodes_(&knownCodes()), knownSlots_(knownCodes_->slots()) {}
+
+AdaptedPacket PacketVersionAdapter::adaptKnown(ByteView blob) {
     AdaptedPacket result;
     result.blob = blob;
     const BasebandPacket framed = frameBasebandPacket(blob);

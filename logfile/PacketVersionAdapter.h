@@ -20,6 +20,7 @@
 #include <cstdint>
 #include <vector>
 
+#include "core/platform/BasebandPacket.h"
 #include "core/platform/ByteView.h"
 #include "logfile/versions/VersionLayout.h"
 
@@ -41,8 +42,8 @@ inline constexpr std::int16_t kNoVersion = -1;
 struct AdaptedPacket {
     ByteView blob;  // the blob to hand on
     VersionOutcome outcome = VersionOutcome::Unframed;
-    std::int32_t logCode =
-        0;  // as decoders know it (0xFF0000 + code for an extended packet); 0 when unframed
+    // As decoders know it (0xFF0000 + code for an extended packet); 0 when unframed.
+    std::int32_t logCode = 0;
     std::int16_t version = kNoVersion;  // the recorded version
     packet_versions::RewriteTally tally;
 };
@@ -52,11 +53,42 @@ struct AdaptedPacket {
 // layout of the code is known.
 std::int16_t decodedLayoutVersion(std::uint16_t code);
 
+namespace packet_versions {
+class KnownCodes;
+// The slot of a code in the adapter's table of known codes (0..63).
+constexpr unsigned knownCodeSlot(std::uint16_t code) {
+    return static_cast<unsigned>(code ^ (code >> 7)) % 64;
+}
+}  // namespace packet_versions
+
 class PacketVersionAdapter {
   public:
-    AdaptedPacket adapt(ByteView blob);
+    PacketVersionAdapter();
+
+    // Inline, so that the packets of the many codes without other layouts (most of a stream) cost a few
+    // instructions: a plain packet whose code's slot holds no known code is passed on at once.
+    AdaptedPacket adapt(ByteView blob) {
+        const std::size_t prefix =
+            blob.size() >= kChannelPrefixLength && blob[0] == kChannelPrefixMarker ? kChannelPrefixLength : 0;
+        if (blob.size() >= prefix + kPacketTimestampOffset && blob[prefix] == kPlainLogType) {
+            const auto code = static_cast<std::uint16_t>(blob[prefix + kPacketCodeOffset] |
+                                                         blob[prefix + kPacketCodeOffset + 1] << 8);
+            if ((knownSlots_ >> packet_versions::knownCodeSlot(code) & 1) == 0) {
+                AdaptedPacket untracked;
+                untracked.blob = blob;
+                untracked.outcome = VersionOutcome::Untracked;
+                untracked.logCode = code;
+                return untracked;
+            }
+        }
+        return adaptKnown(blob);
+    }
 
   private:
+    AdaptedPacket adaptKnown(ByteView blob);
+
+    const packet_versions::KnownCodes* knownCodes_;
+    std::uint64_t knownSlots_ = 0;  // bit n: some known code lies in slot n
     std::vector<std::uint8_t> buffer_;
 };
 

@@ -48,8 +48,10 @@ void moveFields(std::span<const FieldMove> moves, const RecordReader& payload, s
                 RecordWriter& out, std::size_t to, RewriteTally& tally) {
     for (const FieldMove& move : moves) {
         const std::int64_t raw = readSpot(payload, from, move.from);
+        const std::int64_t scaled = raw * move.scale.multiply + move.scale.add;
+        // Most moves copy a value as it is: no division for them.
         const std::int64_t value =
-            roundedQuotient(raw * move.scale.multiply + move.scale.add, move.scale.divide);
+            move.scale.divide == 1 ? scaled : roundedQuotient(scaled, move.scale.divide);
         writeSpot(out, to, move.to, value, tally);
     }
 }

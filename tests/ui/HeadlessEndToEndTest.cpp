@@ -273,6 +273,46 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
     EXPECT_EQ(testing::hexOf(requests[requests.size() - 3]), "73 00 00 00 00 00 00 00");
     EXPECT_EQ(testing::hexOf(requests[requests.size() - 2]), "60 00");
     EXPECT_EQ(testing::hexOf(requests[requests.size() - 1]), "7d 05 00 00 00 00 00 00");
+
+// A real capture of today's firmware, replayed by the service, reaches the screen with its true values: the
+// service rewrites the newer record versions into the layouts the monitor decodes.
+TEST_F(HeadlessEndToEndTest, AReplayedCaptureShowsItsTrueValues) {
+    const std::string capture = std::string(VELMAR_SOURCE_DIR) + "/samples/captures/lte-connected-1.qmdl";
+    const auto service = testing::KxServerProcess::replaying(runtime_.path(), "lte", capture);
+    ASSERT_TRUE(service->start()) << service->description();
+    auto monitor = startMonitor(outputs_.path());
+    const std::string rsrp =
+        "/Serving Cell/Connected mode LTE Intra-frequency Measurement/Serving Filtered RSRP";
+    testing::LeafValues shown;
+    std::set<std::string> neighbours;
+    const bool complete = monitor->waitForOutput(
+        [&](const std::string& out) {
+            for (const HeadlessLine& line : headlessLines(out)) {
+                if (line.connected && line.tree.isDictionary()) {
+                    shown = testing::leavesOfJson(line.tree);
+                    for (const auto& [path, value] : shown) {
+                        if (path.starts_with("/Neighbor Cells/Measured Neighbor Cells/") &&
+                            path.ends_with("/Physical Cell ID")) {
+                            neighbours.insert(value);
+                        }
+                    }
+                }
+            }
+            // The last 0xB179 record of the capture: serving RSRP -111.4375 dBm.
+            return shown[rsrp] == "-111.50 dBm";
+        },
+        30);
+    ASSERT_TRUE(complete) << monitor->standardOutput() << monitor->errorOutput();
+    EXPECT_EQ(shown["/Serving Cell/Serving Cell Info/Physical Cell ID"], "42");
+    EXPECT_EQ(shown["/Serving Cell/Serving Cell Info/Download Frequency"], "2075");
+    EXPECT_EQ(shown["/Serving Cell/Serving Cell Info/Upload Frequency"], "20075");
+    EXPECT_EQ(shown["/Serving Cell/Serving Cell Info/Download Bandwidth"], "15 MHz");
+    EXPECT_EQ(shown["/Serving Cell/Serving Cell Info/Freq Band Indicator"], "4");
+    EXPECT_EQ(shown["/Serving Cell/Connected mode LTE Intra-frequency Measurement/E-ARFCN"], "2075");
+    EXPECT_EQ(shown["/Serving Cell/Connected mode LTE Intra-frequency Measurement/Serving Physical Cell ID"],
+              "42");
+    EXPECT_TRUE(neighbours.contains("472")) << neighbours.size();
+    EXPECT_TRUE(neighbours.contains("54")) << neighbours.size();
 }
 
 // Every technology of the simulated baseband reaches the screen as a connected tree whose values change.

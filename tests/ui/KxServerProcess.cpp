@@ -4,6 +4,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <utility>
+
 namespace velmar::testing {
 
 namespace {
@@ -48,8 +50,17 @@ KxServerProcess::~KxServerProcess() {
     }
 }
 
+std::unique_ptr<KxServerProcess> KxServerProcess::replaying(std::string runtimeDirectory,
+                                                            std::string technology,
+                                                            const std::string& recording) {
+    auto process = std::make_unique<KxServerProcess>(std::move(runtimeDirectory), std::move(technology));
+    process->source_ = {"--source", "replay", "--input", recording, "--fast"};
+    return process;
+}
+
 std::vector<std::string> KxServerProcess::arguments() const {
-    std::vector<std::string> arguments = {"--source", "sim", "--technology", technology_};
+    std::vector<std::string> arguments = source_;
+    arguments.insert(arguments.end(), {"--technology", technology_});
     arguments.insert(arguments.end(), extraArguments_.begin(), extraArguments_.end());
     return arguments;
 }

@@ -1,5 +1,6 @@
 // KxServerProcess: a real kxserverd for the end-to-end tests of the user interfaces, in its own runtime
-// directory, on the simulated baseband of the given technology; it can be killed and started again.
+// directory, on the simulated baseband of the given technology (or replaying a recording); it can be killed
+// and started again.
 #pragma once
 
 #include <memory>
@@ -15,6 +16,9 @@ class KxServerProcess {
     // extraArguments go to the simulated baseband only (e.g. {"--rate-multiplier", "10"}).
     explicit KxServerProcess(std::string runtimeDirectory, std::string technology = "lte",
                              std::vector<std::string> extraArguments = {});
+    // A service replaying a recorded log as fast as the first client takes it.
+    static std::unique_ptr<KxServerProcess> replaying(std::string runtimeDirectory, std::string technology,
+                                                      const std::string& recording);
     ~KxServerProcess();
     KxServerProcess(const KxServerProcess&) = delete;
     KxServerProcess& operator=(const KxServerProcess&) = delete;
@@ -33,6 +37,7 @@ class KxServerProcess {
     std::string runtimeDirectory_;
     std::string technology_;
     std::vector<std::string> extraArguments_;
+    std::vector<std::string> source_ = {"--source", "sim"};
     std::unique_ptr<BackgroundProcess> process_;
 };
 
