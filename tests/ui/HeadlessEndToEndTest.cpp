@@ -215,11 +215,12 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
     testing::TemporaryDirectory monitorOutputs;
     auto monitor = startMonitor(monitorOutputs.path());
 
-    // The capture's values on screen: its LTE intra-frequency measurement carries subframe number 2075.
+    // The capture's values on screen: its LTE intra-frequency measurement is on E-ARFCN 2075.
     const auto showsTheCapture = [](const std::string& out) {
         for (const HeadlessLine& line : headlessLines(out)) {
             for (const auto& [path, value] : testing::leavesOfJson(line.tree)) {
-                if (line.connected && path.ends_with("/Subframe Number") && value == "2075") {
+                if (line.connected && path.ends_with("Intra-frequency Measurement/E-ARFCN") &&
+                    value == "2075") {
                     return true;
                 }
             }
@@ -273,6 +274,7 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
     EXPECT_EQ(testing::hexOf(requests[requests.size() - 3]), "73 00 00 00 00 00 00 00");
     EXPECT_EQ(testing::hexOf(requests[requests.size() - 2]), "60 00");
     EXPECT_EQ(testing::hexOf(requests[requests.size() - 1]), "7d 05 00 00 00 00 00 00");
+}
 
 // A real capture of today's firmware, replayed by the service, reaches the screen with its true values: the
 // service rewrites the newer record versions into the layouts the monitor decodes.

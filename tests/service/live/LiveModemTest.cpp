@@ -155,9 +155,9 @@ TEST_F(LiveModemTest, ProbesSetsUpMasksThatFollowTheChannelsAndEndsWithLoggingOf
     EXPECT_TRUE(service.waitForError("<5> live: " + modemPath() +
                                      ": equipment id 11: logging 6 codes (mask of 0x209 items)\n"));
 
-    // Values flow: the capture's packets of the wanted codes, in the capture's order.
-    const std::vector<PlistData> expected =
-        blobsWithCodes(captureBlobs(samplePath("lte-connected-1.qmdl"), std::nullopt), kLteCodeSet);
+    // Values flow: the capture's packets of the wanted codes, in the capture's order, in the decoded layouts.
+    const std::vector<PlistData> expected = blobsWithCodes(
+        adaptedBlobs(captureBlobs(samplePath("lte-connected-1.qmdl"), std::nullopt)), kLteCodeSet);
     ASSERT_TRUE(runUntil([&] { return first.blobs().size() >= 40; }));
     EXPECT_TRUE(startsLike(first.blobs(), expected));
 
@@ -402,7 +402,7 @@ TEST_F(LiveModemTest, TheLowestSubscriptionOfATwoSimModemStreamsByDefault) {
     const std::string capture = samplePath("multisim-1.qmdl");
     ASSERT_TRUE(client.start(codesOf(blobsOfFile(capture)), {}));
     ASSERT_TRUE(runUntil([&] { return client.blobs().size() >= 60; })) << service.errorOutput();
-    EXPECT_TRUE(startsLike(client.blobs(), captureBlobs(capture, 1)));
+    EXPECT_TRUE(startsLike(client.blobs(), adaptedBlobs(captureBlobs(capture, 1))));
     EXPECT_TRUE(service.waitForError("<5> live: subscription 2: not streamed (streaming subscription 1)\n"));
     EXPECT_EQ(occurrences(service.errorOutput(), "not streamed"), 1U);
 }
@@ -415,7 +415,7 @@ TEST_F(LiveModemTest, SubscriptionPicksAnotherSim) {
     const std::string capture = samplePath("multisim-1.qmdl");
     ASSERT_TRUE(client.start(codesOf(blobsOfFile(capture)), {}));
     ASSERT_TRUE(runUntil([&] { return client.blobs().size() >= 60; })) << service.errorOutput();
-    EXPECT_TRUE(startsLike(client.blobs(), captureBlobs(capture, 2)));
+    EXPECT_TRUE(startsLike(client.blobs(), adaptedBlobs(captureBlobs(capture, 2))));
     EXPECT_TRUE(service.waitForError("<5> live: subscription 1: not streamed (streaming subscription 2)\n"));
 }
 
