@@ -41,7 +41,11 @@ void writeSpot(RecordWriter& out, std::size_t base, const Spot& spot, std::int64
         ++tally.clamped;
     }
     const std::uint64_t pattern = static_cast<std::uint64_t>(value) & ((std::uint64_t{1} << bits) - 1);
-    out.bits(base + spot.offset, spot.width, spot.lowBit, spot.highBit, pattern);
+    if (spot.lowBit == 0 && bits == 8u * spot.width) {
+        out.unsignedLE(base + spot.offset, spot.width, pattern);  // whole bytes: nothing to keep
+    } else {
+        out.bits(base + spot.offset, spot.width, spot.lowBit, spot.highBit, pattern);
+    }
 }
 
 void moveFields(std::span<const FieldMove> moves, const RecordReader& payload, std::size_t from,
@@ -124,6 +128,13 @@ bool rewritePayload(const CodeVersions& code, const VersionTable& table, ByteVie
             static_cast<std::uint32_t>(std::min<std::uint64_t>(count - written, UINT32_MAX));
         writeSpot(writer, base, list.to.count, static_cast<std::int64_t>(written) - list.to.countBias, tally);
 
+        // The decoded list's bytes, zero-filled at once rather than grown entry by entry.
+        if (written > 0) {
+            const std::size_t entryLength = list.to.entryLength != 0 ? list.to.entryLength : list.to.stride;
+            const std::size_t end =
+                toStart + static_cast<std::size_t>(written - 1) * list.to.stride + entryLength;
+            out.resize(std::max(out.size(), base + end), 0);
+        }
         const std::size_t need = sourceEntryNeed(list);
         for (std::uint64_t index = 0; index < written; ++index) {
             const std::size_t from = fromStart + static_cast<std::size_t>(index) * list.from.stride;
@@ -141,12 +152,6 @@ bool rewritePayload(const CodeVersions& code, const VersionTable& table, ByteVie
         // Counts are at most 32 bits wide and strides 16, so these sums cannot wrap.
         fromEnd = fromStart + static_cast<std::size_t>(count) * list.from.stride;
         toEnd = toStart + static_cast<std::size_t>(written) * list.to.stride;
-        if (written > 0) {
-            const std::size_t entryLength = list.to.entryLength != 0 ? list.to.entryLength : list.to.stride;
-            const std::size_t end =
-                toStart + static_cast<std::size_t>(written - 1) * list.to.stride + entryLength;
-            out.resize(std::max(out.size(), base + end), 0);
-        }
         previousWritten = written;
     }
     return true;
