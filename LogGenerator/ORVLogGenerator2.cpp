@@ -70,14 +70,61 @@ void ORVLogGenerator2::updateWithData(ByteView data) {
     }
 }
 
+std::optional<PlistValue> ORVLogGenerator2::loadTemplate() const {
+    const auto path = Resources::pathForResource(pListName, "plist");
+    return path ? readDictionaryFile(*path) : std::nullopt;
+}
+
+bool ORVLogGenerator2::adoptKeptDisplay(const StateDict& state, const PlistValue& display) {
+    // A display that another technology's template built has none of this generator's sections: it gives
+    // way to this technology's own, which the caller builds.
+    const PlistValue keptTemplate = state->get(state_keys::kTemplate);
+    if (!keptTemplate.isNone()) {
+        if (const std::optional<PlistValue> own = loadTemplate(); own && !(*own == keptTemplate)) {
+            SystemLog::log(kLogNotice, "The kept display was built from another template; building %s",
+                           pListName.c_str());
+            state->remove(state_keys::kDisplay);
+            state->remove(state_keys::kTemplate);
+            return false;
+        }
+    }
+    bindSections(display);
+    boundDisplay_ = display.dictionary();
+    return true;
+}
+
+void ORVLogGenerator2::bindSections(const PlistValue& displayValue) {
+    // The same walk and order as processTemplate, so that a section named twice binds to the same place.
+    if (const PlistDictionaryRef& dictionary = displayValue.dictionary()) {
+        for (const auto& [key, value] : *dictionary) {
+            bindSections(value);
+            if (Base* decoder = cIndex ? cIndex->getClass(key) : nullptr) {
+                decoder->updateSectionRef(value);
+            }
+        }
+    } else if (const PlistArrayRef& array = displayValue.array()) {
+        for (const PlistValue& element : *array) {
+            bindSections(element);
+        }
+    }
+}
+
 PlistValue ORVLogGenerator2::getDisplayFromState(const StateDict& state) {
     if (const PlistValue* display = state->find(state_keys::kDisplay); display && !display->isNone()) {
-        return *display;
+        // A display kept from an earlier generator (the state outlives channel restarts) gets this
+        // generator's decoders bound to its sections the first time this generator sees it.
+        const PlistDictionaryRef& root = display->dictionary();
+        if (!root || boundDisplay_.lock() == root) {
+            return *display;
+        }
+        const PlistValue kept = *display;
+        if (adoptKeptDisplay(state, kept)) {
+            return kept;
+        }
     }
     PlistValue templateValue = state->get(state_keys::kTemplate);
     if (templateValue.isNone()) {
-        const auto path = Resources::pathForResource(pListName, "plist");
-        std::optional<PlistValue> loaded = path ? readDictionaryFile(*path) : std::nullopt;
+        std::optional<PlistValue> loaded = loadTemplate();
         if (!loaded) {
             SystemLog::log(kLogError, "Cannot load template for display");
             return PlistValue();
@@ -93,6 +140,7 @@ PlistValue ORVLogGenerator2::getDisplayFromState(const StateDict& state) {
     PlistValue tree = processTemplate(templateValue);
     printDict(tree);
     if (!tree.isNone()) {
+        boundDisplay_ = tree.dictionary();
         state->set(state_keys::kDisplay, tree);
         state->set(state_keys::kExtraInfo, PlistValue::newDictionary());
     }

@@ -102,6 +102,49 @@ TEST_F(TemplateDisplayTest, SectionKeysBindDecodersWhereverTheyStand) {
                     .isArray());
 }
 
+TEST_F(TemplateDisplayTest, ANewGeneratorWritesIntoTheDisplayKeptInTheState) {
+    // The state outlives the generator: after a channel restart a new generator of the same technology finds
+    // the display in it and its decoders must write there, or the screen freezes.
+    PlistDictionaryRef serving;
+    {
+        RecordingGenerator first("Test", {{"Serving", std::vector<std::int32_t>{1}}});
+        first.updateState(state, packet(1));
+        serving = state->get(kDisplay).dictionary()->get("Radio").dictionary()->get("Serving").dictionary();
+        ASSERT_TRUE(serving);
+        EXPECT_EQ(*serving->get("Length").string(), "20");
+    }
+    const PlistDictionaryRef keptDisplay = state->get(kDisplay).dictionary();
+    RecordingGenerator second("Test", {{"Serving", std::vector<std::int32_t>{1}}});
+    std::vector<std::uint8_t> longer = packet(1);
+    longer.resize(33);
+    second.updateState(state, longer);
+    EXPECT_EQ(state->get(kDisplay).dictionary(), keptDisplay);
+    EXPECT_EQ(*serving->get("Length").string(), "33");
+    // The kept display is returned as it stands, not rebuilt.
+    EXPECT_EQ(second.generateLogUsingState(state).dictionary(), keptDisplay);
+}
+
+TEST_F(TemplateDisplayTest, ADisplayBuiltFromAnotherTemplateGivesWayToTheNewGeneratorsOwn) {
+    testing::writeWholeFile(resources_.file("Other.plist"), R"(<?xml version="1.0" encoding="UTF-8"?>
+<plist version="1.0"><dict><key>Other</key><dict><key>Serving</key><dict/></dict></dict></plist>
+)");
+    {
+        RecordingGenerator first("Test", {{"Serving", std::vector<std::int32_t>{1}}});
+        first.updateState(state, packet(1));
+    }
+    RecordingGenerator second("Other", {{"Serving", std::vector<std::int32_t>{1}}});
+    testing::LogCapture capture;
+    second.updateState(state, packet(1));
+    ASSERT_FALSE(capture.texts().empty());
+    EXPECT_EQ(capture.texts().front(), "The kept display was built from another template; building Other");
+    const PlistDictionaryRef display = state->get(kDisplay).dictionary();
+    ASSERT_TRUE(display);
+    EXPECT_FALSE(display->contains("Radio"));
+    const PlistDictionaryRef serving = display->get("Other").dictionary()->get("Serving").dictionary();
+    ASSERT_TRUE(serving);
+    EXPECT_EQ(*serving->get("Length").string(), "20");
+}
+
 TEST_F(TemplateDisplayTest, BuildingTheTreeLogsItsDiagnostics) {
     RecordingGenerator generator("Test", {{"Serving", std::vector<std::int32_t>{1}}});
     testing::LogCapture capture;
