@@ -1,12 +1,17 @@
 #include "core/platform/MessagePort.h"
 
+#include <dirent.h>
 #include <fcntl.h>
 #include <poll.h>
+#include <signal.h>
 #include <sys/socket.h>
+#include <sys/stat.h>
 #include <sys/un.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <charconv>
 #include <chrono>
 #include <cstring>
 #include <vector>
@@ -26,12 +31,16 @@ struct PacketHeader {
 constexpr std::uint32_t kFlagReplyWanted = 1;
 constexpr std::uint32_t kFlagIsReply = 2;
 constexpr int kSocketBufferBytes = 4 * 1024 * 1024;
+// A port that cannot accept (out of descriptors) waits this long before it tries again, doubling up to the
+// longest wait while the failures go on.
+constexpr double kFirstAcceptBackoffSeconds = 0.05;
+constexpr double kLongestAcceptBackoffSeconds = 1.0;
 
 bool fillAddress(const std::string& path, sockaddr_un& address) {
     std::memset(&address, 0, sizeof address);
     address.sun_family = AF_UNIX;
     if (path.size() >= sizeof address.sun_path) {
-        SystemLog::log(kLogError, "Socket path too long: %s", path.c_str());
+        errno = ENAMETOOLONG;
         return false;
     }
     std::memcpy(address.sun_path, path.c_str(), path.size() + 1);
@@ -56,15 +65,31 @@ bool connectTo(int fd, const std::string& path) {
     return connect(fd, reinterpret_cast<const sockaddr*>(&address), sizeof address) == 0;
 }
 
-// Whether a live listener answers at path.
-bool listenerAnswers(const std::string& path) {
-    const int probe = newSocket();
+enum class Listener { Answers, None, Unknown };
+
+// Whether a live listener answers at path. A listener whose backlog is full still answers; when no probe can
+// be made (out of descriptors) nobody can tell.
+Listener probeListener(const std::string& path, int* error = nullptr) {
+    const int probe = socket(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
     if (probe < 0) {
-        return false;
+        if (error != nullptr) {
+            *error = errno;
+        }
+        return Listener::Unknown;
     }
-    const bool answers = connectTo(probe, path);
+    const bool connected = connectTo(probe, path);
+    const int reason = errno;
     close(probe);
-    return answers;
+    if (connected || reason == EAGAIN) {
+        return Listener::Answers;
+    }
+    if (reason == ECONNREFUSED || reason == ENOENT) {
+        return Listener::None;
+    }
+    if (error != nullptr) {
+        *error = reason;
+    }
+    return Listener::Unknown;
 }
 
 int remainingMs(std::chrono::steady_clock::time_point deadline) {
@@ -81,14 +106,11 @@ std::chrono::steady_clock::time_point deadlineAfter(double seconds) {
 
 enum class SendOutcome { Sent, TimedOut, Broken };
 
-SendOutcome sendPacket(int fd, std::int32_t messageId, std::uint32_t flags, ByteView data, double timeout) {
-    const PacketHeader header{messageId, flags};
-    iovec parts[2] = {{const_cast<PacketHeader*>(&header), sizeof header},
-                      {const_cast<std::uint8_t*>(data.data()), data.size()}};
+// Writes one packet without blocking: Sent, TimedOut when the socket cannot take it now, or Broken.
+SendOutcome sendNow(int fd, const iovec* parts, std::size_t count) {
     msghdr message{};
-    message.msg_iov = parts;
-    message.msg_iovlen = data.empty() ? 1 : 2;
-    const auto deadline = deadlineAfter(timeout);
+    message.msg_iov = const_cast<iovec*>(parts);
+    message.msg_iovlen = count;
     for (;;) {
         if (sendmsg(fd, &message, MSG_DONTWAIT | MSG_NOSIGNAL) >= 0) {
             return SendOutcome::Sent;
@@ -96,8 +118,19 @@ SendOutcome sendPacket(int fd, std::int32_t messageId, std::uint32_t flags, Byte
         if (errno == EINTR) {
             continue;
         }
-        if (errno != EAGAIN && errno != EWOULDBLOCK) {
-            return SendOutcome::Broken;
+        return (errno == EAGAIN || errno == EWOULDBLOCK) ? SendOutcome::TimedOut : SendOutcome::Broken;
+    }
+}
+
+SendOutcome sendPacket(int fd, std::int32_t messageId, std::uint32_t flags, ByteView data, double timeout) {
+    const PacketHeader header{messageId, flags};
+    const iovec parts[2] = {{const_cast<PacketHeader*>(&header), sizeof header},
+                            {const_cast<std::uint8_t*>(data.data()), data.size()}};
+    const auto deadline = deadlineAfter(timeout);
+    for (;;) {
+        const SendOutcome outcome = sendNow(fd, parts, data.empty() ? 1 : 2);
+        if (outcome != SendOutcome::TimedOut) {
+            return outcome;
         }
         pollfd wait{fd, POLLOUT, 0};
         const int waitMs = remainingMs(deadline);
@@ -110,9 +143,25 @@ SendOutcome sendPacket(int fd, std::int32_t messageId, std::uint32_t flags, Byte
     }
 }
 
+PlistData encodePacket(std::int32_t messageId, std::uint32_t flags, ByteView data) {
+    const PacketHeader header{messageId, flags};
+    PlistData packet(sizeof header + data.size());
+    std::memcpy(packet.data(), &header, sizeof header);
+    if (!data.empty()) {
+        std::memcpy(packet.data() + sizeof header, data.data(), data.size());
+    }
+    return packet;
+}
+
 enum class ReceiveOutcome { Message, Empty, HungUp };
 
-// Reads one packet without blocking.
+// Whether the peer of fd has hung up (a zero-byte read means either that or an empty packet).
+bool peerHungUp(int fd) {
+    pollfd check{fd, POLLRDHUP, 0};
+    return poll(&check, 1, 0) > 0 && (check.revents & (POLLRDHUP | POLLHUP | POLLERR)) != 0;
+}
+
+// Reads one packet without blocking. Packets too short to carry a header, empty ones included, are dropped.
 ReceiveOutcome receivePacket(int fd, PacketHeader& header, PlistData& payload) {
     for (;;) {
         const ssize_t size = recv(fd, nullptr, 0, MSG_PEEK | MSG_TRUNC | MSG_DONTWAIT);
@@ -123,7 +172,15 @@ ReceiveOutcome receivePacket(int fd, PacketHeader& header, PlistData& payload) {
             return (errno == EAGAIN || errno == EWOULDBLOCK) ? ReceiveOutcome::Empty : ReceiveOutcome::HungUp;
         }
         if (size == 0) {
-            return ReceiveOutcome::HungUp;
+            if (peerHungUp(fd)) {
+                return ReceiveOutcome::HungUp;
+            }
+            std::uint8_t none = 0;
+            if (recv(fd, &none, 0, MSG_DONTWAIT) < 0 && errno != EINTR) {
+                return (errno == EAGAIN || errno == EWOULDBLOCK) ? ReceiveOutcome::Empty
+                                                                 : ReceiveOutcome::HungUp;
+            }
+            continue;
         }
         std::vector<std::uint8_t> packet(static_cast<std::size_t>(size));
         const ssize_t got = recv(fd, packet.data(), packet.size(), MSG_DONTWAIT);
@@ -142,13 +199,8 @@ ReceiveOutcome receivePacket(int fd, PacketHeader& header, PlistData& payload) {
     }
 }
 
-bool peerIsTrusted(int fd) {
-    ucred credentials{};
-    socklen_t length = sizeof credentials;
-    if (getsockopt(fd, SOL_SOCKET, SO_PEERCRED, &credentials, &length) != 0) {
-        return false;
-    }
-    return credentials.uid == getuid() || credentials.uid == 0;
+bool processRuns(pid_t pid) {
+    return pid > 0 && (kill(pid, 0) == 0 || errno == EPERM);
 }
 
 }  // namespace
@@ -158,55 +210,90 @@ MessagePort::MessagePort(std::string name, bool local) : name_(std::move(name)),
 MessagePort::~MessagePort() { closeEverything(); }
 
 std::shared_ptr<MessagePort> MessagePort::createLocal(const std::string& name, MessageCallback callback,
-                                                      bool* alreadyExists, LocalMode mode) {
+                                                      bool* alreadyExists, LocalMode mode,
+                                                      std::string* failure) {
     if (alreadyExists) {
         *alreadyExists = false;
     }
-    const auto path = RuntimeDirectory::socketPathFor(name);
+    const auto fail = [&](const std::string& reason) -> std::shared_ptr<MessagePort> {
+        SystemLog::log(kLogError, "Cannot create port %s: %s", name.c_str(), reason.c_str());
+        if (failure != nullptr) {
+            *failure = reason;
+        }
+        return nullptr;
+    };
+    std::string why;
+    const auto path = RuntimeDirectory::socketPathFor(name, &why);
     if (!path) {
+        if (failure != nullptr) {
+            *failure = why;
+        }
         return nullptr;
     }
     std::shared_ptr<MessagePort> port(new MessagePort(name, true));
     port->mode_ = mode;
     port->callback_ = std::move(callback);
     port->socketPath_ = *path;
-    if (listenerAnswers(*path)) {
-        if (alreadyExists) {
-            *alreadyExists = true;
+    struct stat info {};
+    if (lstat(path->c_str(), &info) == 0) {
+        // Only a socket file is ours to judge: anything else at the name was put there by someone else.
+        if (S_ISLNK(info.st_mode)) {
+            return fail(*path + " is a symbolic link, not a socket");
         }
-        port->valid_ = false;
-        return port;
+        if (!S_ISSOCK(info.st_mode)) {
+            return fail(*path + " exists and is not a socket");
+        }
+        int error = 0;
+        switch (probeListener(*path, &error)) {
+            case Listener::Answers:
+                if (alreadyExists) {
+                    *alreadyExists = true;
+                }
+                port->valid_ = false;
+                return port;
+            case Listener::Unknown:
+                return fail("cannot tell whether " + *path + " is in use: " + std::strerror(error));
+            case Listener::None:
+                unlink(path->c_str());  // a stale file with no listener is removed and reused
+                break;
+        }
     }
     const int fd = newSocket();
     if (fd < 0) {
-        return nullptr;
+        return fail(std::string("cannot create a socket: ") + std::strerror(errno));
     }
     sockaddr_un address{};
-    if (!fillAddress(*path, address)) {
-        close(fd);
-        return nullptr;
-    }
-    unlink(path->c_str());  // a stale file with no listener is removed and reused
+    fillAddress(*path, address);
     if (bind(fd, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0 || listen(fd, 64) != 0) {
-        SystemLog::log(kLogError, "Cannot listen on %s: %s", path->c_str(), std::strerror(errno));
+        const int error = errno;
         close(fd);
-        return nullptr;
+        return fail("cannot listen on " + *path + ": " + std::strerror(error));
     }
     port->fd_ = fd;
     port->owner_ = true;
     return port;
 }
 
-std::shared_ptr<MessagePort> MessagePort::createRemote(const std::string& name) {
-    const auto path = RuntimeDirectory::socketPathFor(name);
+std::shared_ptr<MessagePort> MessagePort::createRemote(const std::string& name, std::string* failure) {
+    std::string why;
+    const auto path = RuntimeDirectory::socketPathFor(name, &why);
     if (!path) {
+        if (failure != nullptr) {
+            *failure = why;
+        }
         return nullptr;
     }
     const int fd = newSocket();
     if (fd < 0) {
+        if (failure != nullptr) {
+            *failure = std::string("cannot create a socket: ") + std::strerror(errno);
+        }
         return nullptr;
     }
     if (!connectTo(fd, *path)) {
+        if (failure != nullptr) {
+            *failure = "cannot connect to " + *path + ": " + std::strerror(errno);
+        }
         close(fd);
         return nullptr;
     }
@@ -216,8 +303,49 @@ std::shared_ptr<MessagePort> MessagePort::createRemote(const std::string& name) 
     return port;
 }
 
+int MessagePort::removeStalePorts(std::string_view prefix, std::string_view suffix) {
+    const auto directory = RuntimeDirectory::path();
+    if (!directory) {
+        return 0;
+    }
+    DIR* listing = opendir(directory->c_str());
+    if (listing == nullptr) {
+        return 0;
+    }
+    int removed = 0;
+    while (const dirent* entry = readdir(listing)) {
+        const std::string_view name = entry->d_name;
+        if (!name.starts_with(prefix)) {
+            continue;
+        }
+        const std::string_view tail = name.substr(prefix.size());
+        pid_t pid = 0;
+        const auto [end, error] = std::from_chars(tail.data(), tail.data() + tail.size(), pid);
+        const std::string_view rest(end, static_cast<std::size_t>(tail.data() + tail.size() - end));
+        if (error != std::errc() || end == tail.data() || (!rest.empty() && rest.front() != '.') ||
+            !rest.ends_with(suffix) || processRuns(pid)) {
+            continue;
+        }
+        const std::string path = *directory + "/" + std::string(name);
+        struct stat info {};
+        if (lstat(path.c_str(), &info) != 0 || !S_ISSOCK(info.st_mode) || info.st_uid != getuid() ||
+            probeListener(path) != Listener::None) {
+            continue;
+        }
+        if (unlink(path.c_str()) == 0) {
+            ++removed;
+        }
+    }
+    closedir(listing);
+    if (removed != 0) {
+        SystemLog::log(kLogNotice, "Removed %d socket files that ended processes left behind", removed);
+    }
+    return removed;
+}
+
 void MessagePort::setDispatchQueue(MainQueue& queue) {
     stopWatching();
+    acceptBackoff_ = 0;
     queue_ = &queue;
     if (!valid_ || fd_ < 0) {
         return;
@@ -230,12 +358,7 @@ void MessagePort::setDispatchQueue(MainQueue& queue) {
             }
         });
         for (auto& [fd, connection] : connections_) {
-            const int connectionFd = fd;
-            connection.watch = queue.watchReadable(fd, [self, connectionFd] {
-                if (auto port = self.lock()) {
-                    port->readConnection(connectionFd);
-                }
-            });
+            watchConnection(connection);
         }
     } else {
         listenWatch_ = queue.watchReadable(fd_, [self] {
@@ -252,40 +375,140 @@ void MessagePort::setInvalidationCallback(InvalidationCallback callback) {
 
 void MessagePort::setNotificationCallback(MessageCallback callback) { notificationCallback_ = std::move(callback); }
 
-void MessagePort::acceptConnections() {
-    for (;;) {
-        const int fd = accept4(fd_, nullptr, nullptr, SOCK_CLOEXEC | SOCK_NONBLOCK);
-        if (fd < 0) {
-            return;
+void MessagePort::watchConnection(Connection& connection) {
+    if (queue_ == nullptr) {
+        return;
+    }
+    std::weak_ptr<MessagePort> self = weak_from_this();
+    const int fd = connection.fd;
+    connection.watch = queue_->watchReadable(fd, [self, fd] {
+        if (auto port = self.lock()) {
+            port->readConnection(fd);
         }
-        if (!peerIsTrusted(fd)) {
-            ucred credentials{};
-            socklen_t length = sizeof credentials;
-            getsockopt(fd, SOL_SOCKET, SO_PEERCRED, &credentials, &length);
+    });
+    if (!connection.unsent.empty()) {
+        connection.writeWatch = queue_->watchWritable(fd, [self, fd] {
+            if (auto port = self.lock()) {
+                port->flushReplies(fd);
+            }
+        });
+    }
+}
+
+bool MessagePort::admit(int fd, Peer& peer) {
+    if (!refusals_) {
+        refusals_ = std::make_unique<LogRateLimit>("port " + name_ + ": refused connections", kLogError);
+    }
+    ucred credentials{};
+    socklen_t length = sizeof credentials;
+    if (getsockopt(fd, SOL_SOCKET, SO_PEERCRED, &credentials, &length) != 0) {
+        if (refusals_->allow()) {
+            SystemLog::log(kLogError, "Refused a connection on port %s: its peer is unknown (%s)",
+                           name_.c_str(), std::strerror(errno));
+        }
+        return false;
+    }
+    peer.pid = credentials.pid;
+    peer.uid = credentials.uid;
+    if (credentials.uid != getuid() && credentials.uid != 0) {
+        if (refusals_->allow()) {
             SystemLog::log(kLogError, "Refused a connection from uid %u on port %s",
                            static_cast<unsigned>(credentials.uid), name_.c_str());
-            close(fd);
-            continue;
+        }
+        return false;
+    }
+    if (onlyPid_ != 0 && credentials.pid != onlyPid_) {
+        if (refusals_->allow()) {
+            SystemLog::log(kLogError, "Refused a connection from pid %d on port %s, which serves pid %d only",
+                           static_cast<int>(credentials.pid), name_.c_str(), static_cast<int>(onlyPid_));
+        }
+        return false;
+    }
+    if (connections_.size() >= maxConnections_) {
+        if (refusals_->allow()) {
+            SystemLog::log(kLogError,
+                           "Refused a connection from pid %d on port %s: %zu connections are open, "
+                           "the most it takes",
+                           static_cast<int>(credentials.pid), name_.c_str(), connections_.size());
+        }
+        return false;
+    }
+    return true;
+}
+
+void MessagePort::acceptConnections() {
+    for (int accepted = 0; accepted < kAcceptsPerWake && valid_ && fd_ >= 0; ++accepted) {
+        const int fd = accept4(fd_, nullptr, nullptr, SOCK_CLOEXEC | SOCK_NONBLOCK);
+        if (fd < 0) {
+            if (errno == EINTR || errno == ECONNABORTED) {
+                continue;
+            }
+            if (errno != EAGAIN && errno != EWOULDBLOCK) {
+                acceptFailed(errno);
+            }
+            return;
+        }
+        if (acceptBackoff_ > 0) {
+            acceptBackoff_ = 0;
+            SystemLog::log(kLogError, "Accepting connections on port %s again", name_.c_str());
         }
         Connection connection;
         connection.fd = fd;
-        if (queue_ != nullptr) {
-            std::weak_ptr<MessagePort> self = weak_from_this();
-            connection.watch = queue_->watchReadable(fd, [self, fd] {
-                if (auto port = self.lock()) {
-                    port->readConnection(fd);
-                }
-            });
+        if (!admit(fd, connection.peer)) {
+            close(fd);
+            continue;
         }
-        connections_.emplace(fd, connection);
+        watchConnection(connection);
+        connections_.emplace(fd, std::move(connection));
     }
+}
+
+void MessagePort::acceptFailed(int error) {
+    // Out of descriptors (or memory) the listening socket stays readable: watching it would spin. The port
+    // stops watching it for a while, longer while the failures go on, and says so once.
+    if (acceptBackoff_ == 0) {
+        SystemLog::log(kLogError, "Cannot accept connections on port %s: %s; trying again now and then",
+                       name_.c_str(), std::strerror(error));
+        acceptBackoff_ = kFirstAcceptBackoffSeconds;
+    } else {
+        acceptBackoff_ = std::min(acceptBackoff_ * 2, kLongestAcceptBackoffSeconds);
+    }
+    if (queue_ == nullptr) {
+        return;
+    }
+    if (listenWatch_ != 0) {
+        queue_->unwatch(listenWatch_);
+        listenWatch_ = 0;
+    }
+    if (acceptRetry_ == 0) {
+        std::weak_ptr<MessagePort> self = weak_from_this();
+        acceptRetry_ = queue_->after(acceptBackoff_, [self] {
+            if (auto port = self.lock()) {
+                port->acceptRetry_ = 0;
+                port->resumeAccepting();
+            }
+        });
+    }
+}
+
+void MessagePort::resumeAccepting() {
+    if (queue_ == nullptr || !valid_ || fd_ < 0 || listenWatch_ != 0) {
+        return;
+    }
+    std::weak_ptr<MessagePort> self = weak_from_this();
+    listenWatch_ = queue_->watchReadable(fd_, [self] {
+        if (auto port = self.lock()) {
+            port->acceptConnections();
+        }
+    });
 }
 
 void MessagePort::readConnection(int fd) {
     // The port may go (invalidation from inside a callback) while we are in here: hold it.
     const std::shared_ptr<MessagePort> keep = shared_from_this();
-    for (;;) {
-        if (!valid_ || connections_.find(fd) == connections_.end()) {
+    for (int handled = 0; handled < kMessagesPerWake; ++handled) {
+        auto found = connections_.find(fd);
+        if (!valid_ || found == connections_.end()) {
             return;
         }
         PacketHeader header{};
@@ -295,28 +518,112 @@ void MessagePort::readConnection(int fd) {
             return;
         }
         if (outcome == ReceiveOutcome::HungUp) {
-            const bool fed = connections_[fd].delivered;
-            closeConnection(fd);
-            if (fed && mode_ == LocalMode::Feeding) {
-                invalidate();
-            }
+            dropConnection(fd);
             return;
         }
-        connections_[fd].delivered = true;
-        std::optional<PlistData> reply;
+        found->second.delivered = true;
+        const Peer peer = found->second.peer;
+        std::optional<PlistData> answer;
         if (callback_) {
-            reply = callback_(header.messageId, payload);
+            sender_ = &peer;
+            answer = callback_(header.messageId, payload);
+            sender_ = nullptr;
         }
-        if ((header.flags & kFlagReplyWanted) && valid_ && connections_.count(fd) != 0) {
-            const ByteView answer = reply ? ByteView(*reply) : ByteView();
-            sendPacket(fd, header.messageId, kFlagIsReply, answer, 1.0);
+        if ((header.flags & kFlagReplyWanted) == 0 || !valid_) {
+            continue;
         }
+        found = connections_.find(fd);
+        if (found != connections_.end()) {
+            reply(found->second, header.messageId, answer ? ByteView(*answer) : ByteView());
+        }
+    }
+}
+
+void MessagePort::reply(Connection& connection, std::int32_t messageId, ByteView answer) {
+    const int fd = connection.fd;
+    if (connection.unsent.empty()) {
+        const PacketHeader header{messageId, kFlagIsReply};
+        const iovec parts[2] = {{const_cast<PacketHeader*>(&header), sizeof header},
+                                {const_cast<std::uint8_t*>(answer.data()), answer.size()}};
+        switch (sendNow(fd, parts, answer.empty() ? 1 : 2)) {
+            case SendOutcome::Sent:
+                return;
+            case SendOutcome::Broken:
+                dropConnection(fd);
+                return;
+            case SendOutcome::TimedOut:
+                break;
+        }
+    }
+    const std::size_t packetSize = sizeof(PacketHeader) + answer.size();
+    if (connection.unsent.size() >= kMaxUnreadReplies ||
+        connection.unsentBytes + packetSize > kMaxUnreadReplyBytes) {
+        if (!refusals_) {
+            refusals_ = std::make_unique<LogRateLimit>("port " + name_ + ": refused connections", kLogError);
+        }
+        if (refusals_->allow()) {
+            SystemLog::log(kLogError,
+                           "Closed a connection from pid %d on port %s: it does not read its replies "
+                           "(%zu waiting)",
+                           static_cast<int>(connection.peer.pid), name_.c_str(),
+                           connection.unsent.size() + 1);
+        }
+        dropConnection(fd);
+        return;
+    }
+    connection.unsent.push_back(encodePacket(messageId, kFlagIsReply, answer));
+    connection.unsentBytes += packetSize;
+    if (connection.writeWatch == 0 && queue_ != nullptr) {
+        std::weak_ptr<MessagePort> self = weak_from_this();
+        connection.writeWatch = queue_->watchWritable(fd, [self, fd] {
+            if (auto port = self.lock()) {
+                port->flushReplies(fd);
+            }
+        });
+    }
+}
+
+void MessagePort::flushReplies(int fd) {
+    const auto found = connections_.find(fd);
+    if (found == connections_.end()) {
+        return;
+    }
+    Connection& connection = found->second;
+    while (!connection.unsent.empty()) {
+        const PlistData& packet = connection.unsent.front();
+        const iovec part{const_cast<std::uint8_t*>(packet.data()), packet.size()};
+        const SendOutcome outcome = sendNow(fd, &part, 1);
+        if (outcome == SendOutcome::TimedOut) {
+            return;
+        }
+        if (outcome == SendOutcome::Broken) {
+            dropConnection(fd);
+            return;
+        }
+        connection.unsentBytes -= packet.size();
+        connection.unsent.pop_front();
+    }
+    if (connection.writeWatch != 0 && queue_ != nullptr) {
+        queue_->unwatch(connection.writeWatch);
+        connection.writeWatch = 0;
+    }
+}
+
+void MessagePort::dropConnection(int fd) {
+    const auto found = connections_.find(fd);
+    if (found == connections_.end()) {
+        return;
+    }
+    const bool fed = found->second.delivered;
+    closeConnection(fd);
+    if (fed && mode_ == LocalMode::Feeding) {
+        invalidate();
     }
 }
 
 void MessagePort::readRemote() {
     const std::shared_ptr<MessagePort> keep = shared_from_this();
-    for (;;) {
+    for (int handled = 0; handled < kMessagesPerWake; ++handled) {
         if (!valid_ || fd_ < 0) {
             return;
         }
@@ -418,8 +725,12 @@ void MessagePort::closeConnection(int fd) {
     if (found == connections_.end()) {
         return;
     }
-    if (queue_ != nullptr && found->second.watch != 0) {
-        queue_->unwatch(found->second.watch);
+    if (queue_ != nullptr) {
+        for (const MainQueue::Handle watch : {found->second.watch, found->second.writeWatch}) {
+            if (watch != 0) {
+                queue_->unwatch(watch);
+            }
+        }
     }
     close(fd);
     connections_.erase(found);
@@ -433,10 +744,16 @@ void MessagePort::stopWatching() {
         queue_->unwatch(listenWatch_);
         listenWatch_ = 0;
     }
+    if (acceptRetry_ != 0) {
+        queue_->cancelTimer(acceptRetry_);
+        acceptRetry_ = 0;
+    }
     for (auto& [fd, connection] : connections_) {
-        if (connection.watch != 0) {
-            queue_->unwatch(connection.watch);
-            connection.watch = 0;
+        for (MainQueue::Handle* watch : {&connection.watch, &connection.writeWatch}) {
+            if (*watch != 0) {
+                queue_->unwatch(*watch);
+                *watch = 0;
+            }
         }
     }
 }
