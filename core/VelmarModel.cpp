@@ -1,12 +1,19 @@
 #include "core/VelmarModel.h"
 
+#include <unistd.h>
+
+#include "core/platform/KxServerProtocol.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 
 namespace velmar {
 
 VelmarModel::VelmarModel(GeneratorFactory factory, MainQueue& queue, VelmarModelDelegate* delegate)
-    : _state(PlistDictionary::create()), factory_(std::move(factory)), queue_(queue), delegate_(delegate) {}
+    : _state(PlistDictionary::create()),
+      factory_(std::move(factory)),
+      queue_(queue),
+      delegate_(delegate),
+      receivePortName_(monitorReceivePortName(getpid())) {}
 
 VelmarModel::~VelmarModel() {
     *alive_ = false;

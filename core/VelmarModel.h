@@ -7,7 +7,10 @@
 // restarts the monitor. Every blob with message id 0 goes to the generator and marks the model updated; a
 // tick that finds it updated drops the display tree and asks the delegate to redraw, asynchronously on the
 // main queue; the tree is rebuilt lazily, at most once per acting tick, by the first topLevelNodes or
-// nodeAtPath. The state, the generator and the tree survive a restart. All of it runs on one main queue.
+// nodeAtPath. The state, the generator and the tree survive a restart. The receive port's name is the
+// process's own (monitorReceivePortName), so several monitors of one user each get a channel; the first
+// createPorts removes the receive-port files of monitors that ended without closing them. All of it runs on
+// one main queue.
 #pragma once
 
 #include <memory>
@@ -32,7 +35,6 @@ class VelmarModel {
 public:
     static constexpr double kDisplayIntervalSeconds = 2.0;
     static constexpr double kRetryDelaySeconds = 5.0;
-    static constexpr const char* kReceivePortName = "com.velmar.Velmar.BasebandStateReport.LogChannel";
 
     VelmarModel(GeneratorFactory factory, MainQueue& queue, VelmarModelDelegate* delegate);
     ~VelmarModel();
@@ -79,7 +81,9 @@ private:
     MainQueue& queue_;
     VelmarModelDelegate* delegate_;
     MainQueue::Handle retryTimer_ = 0;
-    std::string receivePortName_ = kReceivePortName;
+    // This process's own receive port (see monitorReceivePortName); tests may choose another.
+    std::string receivePortName_;
+    bool staleReceivePortsRemoved_ = false;
     // Cleared when the model goes, so that redraw requests still queued do nothing.
     std::shared_ptr<bool> alive_ = std::make_shared<bool>(true);
 };

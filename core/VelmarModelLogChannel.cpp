@@ -7,6 +7,12 @@
 namespace velmar {
 
 bool VelmarModel::createPorts() {
+    if (!staleReceivePortsRemoved_) {
+        // The receive ports of monitors that were killed stay behind as socket files; the first channel
+        // of this monitor clears them away.
+        staleReceivePortsRemoved_ = true;
+        MessagePort::removeStalePorts(kMonitorReceivePortPrefix, kMonitorReceivePortSuffix);
+    }
     const std::string receiveName = receivePortName_;
     bool alreadyExists = false;
     std::weak_ptr<bool> alive = alive_;

@@ -7,6 +7,7 @@
 
 #include "core/platform/RecordReader.h"
 #include "core/platform/WholeFile.h"
+#include "core/platform/plist/PlistCodec.h"
 #include "logfile/DiagCapture.h"
 #include "logfile/DlfFile.h"
 #include "logfile/HexBlobFile.h"
@@ -178,6 +179,38 @@ bool forEachLogItem(const std::string& path, LogFormat format, const LogItemCall
             break;
     }
     error = path + ": no reader for this format";
+    return false;
+}
+
+bool forEachLogItemInBytes(std::span<const std::uint8_t> bytes, const std::string& name, LogFormat format,
+                           const LogItemCallback& callback, std::string& error, LogReadStats* stats) {
+    if (format == LogFormat::Auto) {
+        format = logFormatForExtension(name).value_or(
+            logFormatForContent(bytes.first(std::min(bytes.size(), kLogFormatProbeSize))));
+    }
+    switch (format) {
+        case LogFormat::Hex:
+            return scanHexBlobText(
+                std::string_view(reinterpret_cast<const char*>(bytes.data()), bytes.size()), name, callback,
+                error, stats);
+        case LogFormat::Dlf:
+            return scanDlfBytes(bytes, name, callback, error, stats);
+        case LogFormat::DiagCapture:
+            return scanDiagCaptureBytes(bytes, name, callback, error, stats);
+        case LogFormat::Snapshot: {
+            std::string reason;
+            const std::optional<PlistValue> root = parsePropertyList(bytes, &reason);
+            if (!root || !root->isDictionary()) {
+                error =
+                    name + ": " + (reason.empty() ? std::string("not a property-list dictionary") : reason);
+                return false;
+            }
+            return scanSnapshotValue(*root, name, callback, error, stats);
+        }
+        case LogFormat::Auto:
+            break;
+    }
+    error = name + ": no reader for this format";
     return false;
 }
 

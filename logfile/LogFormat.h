@@ -38,5 +38,10 @@ std::optional<LogFormat> detectLogFormat(const std::string& path, std::string& e
 bool forEachLogItem(const std::string& path, LogFormat format, const LogItemCallback& callback,
                     std::string& error, LogReadStats* stats = nullptr);
 LogReadResult readLogFile(const std::string& path, LogFormat format = LogFormat::Auto);
+// The same for bytes already in memory (a pipe read to its end); name stands for the file in messages and its
+// extension counts for Auto.
+bool forEachLogItemInBytes(std::span<const std::uint8_t> bytes, const std::string& name, LogFormat format,
+                           const LogItemCallback& callback, std::string& error,
+                           LogReadStats* stats = nullptr);
 
 }  // namespace velmar

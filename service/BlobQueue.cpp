@@ -4,8 +4,12 @@
 
 namespace velmar {
 
-BlobQueue::BlobQueue(std::size_t maxBlobs, std::size_t maxBytes)
-    : maxBlobs_(std::max<std::size_t>(maxBlobs, 1)), maxBytes_(maxBytes) {}
+BlobQueue::BlobQueue(std::size_t maxBlobs, std::size_t maxBytes, QueueBudget* budget)
+    : maxBlobs_(std::max<std::size_t>(maxBlobs, 1)), maxBytes_(maxBytes), budget_(budget) {}
+
+BlobQueue::~BlobQueue() {
+    clear();
+}
 
 std::size_t BlobQueue::push(ByteView blob) {
     std::size_t dropped = 0;
@@ -20,6 +24,9 @@ std::size_t BlobQueue::push(ByteView blob) {
     }
     copy.assign(blob.begin(), blob.end());
     bytes_ += copy.size();
+    if (budget_ != nullptr) {
+        budget_->add(copy.size() + kBlobOverhead);
+    }
     blobs_.push_back(std::move(copy));
     return dropped;
 }
@@ -27,7 +34,10 @@ std::size_t BlobQueue::push(ByteView blob) {
 void BlobQueue::pop() {
     PlistData& oldest = blobs_.front();
     bytes_ -= oldest.size();
-    if (spares_.size() < kMaxSpares) {
+    if (budget_ != nullptr) {
+        budget_->remove(oldest.size() + kBlobOverhead);
+    }
+    if (spares_.size() < kMaxSpares && oldest.capacity() <= kMaxSpareCapacity) {
         spares_.push_back(std::move(oldest));
     }
     blobs_.pop_front();

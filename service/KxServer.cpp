@@ -23,29 +23,45 @@ bool isPortName(const std::string& name) {
 
 }  // namespace
 
-KxServer::KxServer(MainQueue& queue, std::string_view technology, bool objectBased)
+KxServer::KxServer(MainQueue& queue, std::string_view technology, bool objectBased, Limits limits)
     : queue_(queue),
       technology_(technology),
       objectBased_(objectBased),
+      limits_(limits),
+      budget_(limits.queueBytes),
+      rejections_("control requests rejected", kLogError),
       alive_(std::make_shared<bool>(true)) {}
 
 KxServer::~KxServer() {
     shutdown();
 }
 
-KxServer::OpenResult KxServer::open() {
+KxServer::OpenResult KxServer::open(std::string* failure) {
+    const std::string controlName(kKxServerControlPortName);
+    bool held = false;
+    std::string reason;
+    lock_ = InstanceLock::acquire(controlName, &held, &reason);
+    if (!lock_) {
+        if (failure != nullptr) {
+            *failure = reason;
+        }
+        return held ? OpenResult::AlreadyRunning : OpenResult::Failed;
+    }
+    // Holding the lock, this is the only service here: the channel sockets of any earlier one are stale.
+    MessagePort::removeStalePorts(kChannelPortPrefix);
     bool exists = false;
     controlPort_ = MessagePort::createLocal(
-        std::string(kKxServerControlPortName),
-        [this](std::int32_t, ByteView data) { return onControlMessage(data); }, &exists,
-        MessagePort::LocalMode::Serving);
-    if (exists) {
+        controlName, [this](std::int32_t, ByteView data) { return onControlMessage(data); }, &exists,
+        MessagePort::LocalMode::Serving, &reason);
+    if (exists || !controlPort_) {
         controlPort_.reset();
-        return OpenResult::AlreadyRunning;
+        lock_.reset();
+        if (failure != nullptr) {
+            *failure = exists ? "a process that holds no lock listens on " + controlName : reason;
+        }
+        return exists ? OpenResult::AlreadyRunning : OpenResult::Failed;
     }
-    if (!controlPort_) {
-        return OpenResult::Failed;
-    }
+    controlPort_->setMaxConnections(limits_.connections);
     controlPort_->setDispatchQueue(queue_);
     return OpenResult::Serving;
 }
@@ -65,11 +81,19 @@ void KxServer::shutdown() {
         controlPort_->invalidate();
         controlPort_.reset();
     }
+    lock_.reset();
 }
 
 PlistData KxServer::reject(std::int32_t error, const std::string& reason) {
-    SystemLog::log(kLogError, "control request rejected: %s", reason.c_str());
+    if (rejections_.allow()) {
+        SystemLog::log(kLogError, "control request rejected: %s", reason.c_str());
+    }
     return kxErrorReply(error, reason);
+}
+
+std::size_t KxServer::openChannels() const {
+    return static_cast<std::size_t>(std::count_if(channels_.begin(), channels_.end(),
+                                                  [](const auto& channel) { return !channel->ended(); }));
 }
 
 std::optional<PlistData> KxServer::onControlMessage(ByteView data) {
@@ -93,19 +117,35 @@ std::optional<PlistData> KxServer::onControlMessage(ByteView data) {
         return reject(kKxErrorBadRequest,
                       "ReceivePort " + quotedForLog(*receivePort) + " is not a port name");
     }
+    const std::string controlName(kKxServerControlPortName);
+    if (*receivePort == controlName || receivePort->starts_with(controlName + ".")) {
+        return reject(kKxErrorBadRequest,
+                      "ReceivePort " + quotedForLog(*receivePort) + " names one of the service's own ports");
+    }
+    if (openChannels() >= limits_.channels) {
+        return reject(kKxErrorTooManyChannels, std::to_string(openChannels()) +
+                                                   " channels are open, the most this service takes "
+                                                   "(--max-channels)");
+    }
 
     LogChannel::Settings settings;
     settings.id = nextChannelId_++;
-    settings.channelPortName = std::string(kKxServerControlPortName) + ".channel." +
-                               std::to_string(getpid()) + "." + std::to_string(settings.id);
+    settings.channelPortName =
+        std::string(kChannelPortPrefix) + std::to_string(getpid()) + "." + std::to_string(settings.id);
     settings.receivePortName = *receivePort;
     settings.technology = technology_;
     settings.objectBased = objectBased_;
+    settings.budget = &budget_;
+    if (const MessagePort::Peer* sender = controlPort_->messageSender()) {
+        settings.clientPid = sender->pid;
+    }
     std::int32_t error = 0;
     std::string reason;
     std::shared_ptr<LogChannel> channel = LogChannel::open(settings, queue_, *this, error, reason);
     if (!channel) {
-        SystemLog::log(kLogError, "channel %u not created: %s", settings.id, reason.c_str());
+        if (rejections_.allow()) {
+            SystemLog::log(kLogError, "channel %u not created: %s", settings.id, reason.c_str());
+        }
         return kxErrorReply(error, reason);
     }
     SystemLog::log(kLogNotice, "channel %u: created for receive port %s, listening on %s", settings.id,

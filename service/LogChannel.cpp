@@ -1,5 +1,6 @@
 #include "service/LogChannel.h"
 
+#include <algorithm>
 #include <cinttypes>
 
 #include "core/platform/KxServerProtocol.h"
@@ -11,14 +12,25 @@
 namespace velmar {
 
 LogChannel::LogChannel(Settings settings, MainQueue& queue, Listener& listener)
-    : settings_(std::move(settings)), queue_(queue), listener_(listener) {}
+    : settings_(std::move(settings)),
+      queue_(queue),
+      listener_(listener),
+      queued_(kQueueBlobs, kQueueBytes, settings_.budget),
+      rejections_("channel " + std::to_string(settings_.id) + ": rejected commands", kLogError) {
+    if (settings_.budget != nullptr) {
+        settings_.budget->join(*this);
+    }
+}
 
 LogChannel::~LogChannel() {
-    if (flushTimer_ != 0) {
-        queue_.cancelTimer(flushTimer_);
+    if (stallTimer_ != 0) {
+        queue_.cancelTimer(stallTimer_);
     }
     if (dropTimer_ != 0) {
         queue_.cancelTimer(dropTimer_);
+    }
+    if (settings_.budget != nullptr) {
+        settings_.budget->leave(*this);
     }
 }
 
@@ -26,10 +38,11 @@ std::shared_ptr<LogChannel> LogChannel::open(Settings settings, MainQueue& queue
                                              std::int32_t& error, std::string& reason) {
     std::shared_ptr<LogChannel> channel(new LogChannel(std::move(settings), queue, listener));
     const Settings& names = channel->settings_;
-    channel->receivePort_ = MessagePort::createRemote(names.receivePortName);
+    std::string failure;
+    channel->receivePort_ = MessagePort::createRemote(names.receivePortName, &failure);
     if (!channel->receivePort_) {
         error = kKxErrorCannotReachReceivePort;
-        reason = "cannot connect to receive port " + quotedForLog(names.receivePortName);
+        reason = "cannot connect to receive port " + quotedForLog(names.receivePortName) + ": " + failure;
         return nullptr;
     }
     const std::weak_ptr<LogChannel> self = channel;
@@ -42,11 +55,17 @@ std::shared_ptr<LogChannel> LogChannel::open(Settings settings, MainQueue& queue
             }
             return std::nullopt;
         },
-        &exists, MessagePort::LocalMode::Feeding);
+        &exists, MessagePort::LocalMode::Feeding, &failure);
     if (!channel->channelPort_ || exists) {
         error = kKxErrorCannotOpenChannelPort;
-        reason = "cannot listen on channel port " + names.channelPortName;
+        reason = "cannot listen on channel port " + names.channelPortName + ": " +
+                 (exists ? std::string("another process listens there") : failure);
         return nullptr;
+    }
+    // The channel is its client's: a stranger that connects could end it by hanging up.
+    channel->channelPort_->setMaxConnections(kChannelPortConnections);
+    if (names.clientPid != 0) {
+        channel->channelPort_->acceptOnlyFrom(names.clientPid);
     }
     channel->channelPort_->setInvalidationCallback([self] {
         if (const std::shared_ptr<LogChannel> live = self.lock()) {
@@ -71,7 +90,9 @@ std::optional<PlistData> LogChannel::onCommand(ByteView data) {
     const std::optional<PlistValue> message = parsePropertyList(data);
     const PlistDictionaryRef command = message ? message->dictionary() : nullptr;
     if (!command) {
-        SystemLog::log(kLogError, "channel %u: command rejected: not a property-list dictionary", id());
+        if (rejections_.allow()) {
+            SystemLog::log(kLogError, "channel %u: command rejected: not a property-list dictionary", id());
+        }
         return kxErrorReply(kKxErrorBadRequest, "command is not a property-list dictionary");
     }
     std::optional<PlistData> reply;
@@ -81,7 +102,9 @@ std::optional<PlistData> LogChannel::onCommand(ByteView data) {
         if (const std::string* name = state->string()) {
             onStateCommand(*command, *name, reply);
         } else {
-            SystemLog::log(kLogError, "channel %u: command rejected: SetState is not a string", id());
+            if (rejections_.allow()) {
+                SystemLog::log(kLogError, "channel %u: command rejected: SetState is not a string", id());
+            }
             reply = kxErrorReply(kKxErrorBadRequest, "SetState is not a string");
         }
     }
@@ -92,7 +115,10 @@ std::optional<PlistData> LogChannel::onCommand(ByteView data) {
         }
     }
     if (!understood) {
-        SystemLog::log(kLogError, "channel %u: command rejected: neither GetTechnology nor SetState", id());
+        if (rejections_.allow()) {
+            SystemLog::log(kLogError, "channel %u: command rejected: neither GetTechnology nor SetState",
+                           id());
+        }
         reply = kxErrorReply(kKxErrorBadRequest, "unknown command: neither GetTechnology nor SetState");
     }
     return reply;
@@ -134,30 +160,53 @@ void LogChannel::onStateCommand(const PlistDictionary& command, const std::strin
 }
 
 void LogChannel::send(ByteView bytes) {
-    if (!queued_.empty()) {
-        noteDrops(queued_.push(bytes));  // behind the queue; the flush timer is running
-        return;
-    }
-    const std::int32_t status = receivePort_->sendRequest(0, bytes, 0.0, 0.0, false, nullptr);
-    if (status == kMessagePortSuccess) {
-        ++sent_;
-    } else if (status == kMessagePortSendTimeout) {
+    if (queued_.empty()) {
+        const std::int32_t status = receivePort_->sendRequest(0, bytes, 0.0, 0.0, false, nullptr);
+        if (status == kMessagePortSuccess) {
+            ++sent_;
+            return;
+        }
+        if (status != kMessagePortSendTimeout) {
+            sendFailed(status);
+            return;
+        }
         lastProgress_ = std::chrono::steady_clock::now();  // the stall clock starts with the backlog
-        noteDrops(queued_.push(bytes));
-        scheduleFlush();
-    } else {
-        sendFailed(status);
+    }
+    noteDrops(queued_.push(bytes));
+    scheduleFlush();
+    watchForStall();
+    if (settings_.budget != nullptr) {
+        settings_.budget->enforce();
     }
 }
 
 void LogChannel::scheduleFlush() {
-    if (flushTimer_ != 0 || ended_) {
+    if (flushArmed_ || ended_ || !receivePort_) {
         return;
     }
-    flushTimer_ = queue_.after(kRetrySeconds, [self = weak_from_this()] {
+    flushArmed_ = true;
+    receivePort_->whenWritable([self = weak_from_this()] {
         if (const std::shared_ptr<LogChannel> live = self.lock()) {
-            live->flushTimer_ = 0;
+            live->flushArmed_ = false;
             live->flush();
+        }
+    });
+}
+
+void LogChannel::watchForStall() {
+    if (stallTimer_ != 0 || ended_ || !streaming_ || queued_.size() < kKeepsUpBelow) {
+        return;
+    }
+    const double since =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - lastProgress_).count();
+    stallTimer_ = queue_.after(std::max(kStallSeconds - since, 0.01), [self = weak_from_this()] {
+        if (const std::shared_ptr<LogChannel> live = self.lock()) {
+            live->stallTimer_ = 0;
+            if (live->stalled(std::chrono::steady_clock::now())) {
+                live->listener_.channelReady(*live);  // a source waiting for this client waits no more
+            } else {
+                live->watchForStall();
+            }
         }
     });
 }
@@ -169,7 +218,11 @@ bool LogChannel::stalled(std::chrono::steady_clock::time_point now) const {
 
 void LogChannel::flush() {
     const std::uint64_t sentBefore = sent_;
-    while (!queued_.empty() && !ended_) {
+    for (int sent = 0; !queued_.empty() && !ended_; ++sent) {
+        if (sent == kFlushPerWake) {
+            scheduleFlush();  // the rest on a later wake: other channels and timers first
+            break;
+        }
         const std::int32_t status = receivePort_->sendRequest(0, queued_.front(), 0.0, 0.0, false, nullptr);
         if (status == kMessagePortSuccess) {
             ++sent_;
@@ -189,6 +242,15 @@ void LogChannel::flush() {
     if (streaming_ && (queued_.size() < kKeepsUpBelow || stalled(now))) {
         listener_.channelReady(*this);
     }
+}
+
+bool LogChannel::shedOldest() {
+    if (queued_.empty()) {
+        return false;
+    }
+    queued_.pop();
+    noteDrops(1);
+    return true;
 }
 
 void LogChannel::noteDrops(std::size_t count) {
@@ -233,9 +295,9 @@ void LogChannel::end(const std::string& reason) {
     }
     ended_ = true;
     streaming_ = false;
-    if (flushTimer_ != 0) {
-        queue_.cancelTimer(flushTimer_);
-        flushTimer_ = 0;
+    if (stallTimer_ != 0) {
+        queue_.cancelTimer(stallTimer_);
+        stallTimer_ = 0;
     }
     if (dropTimer_ != 0) {
         queue_.cancelTimer(dropTimer_);

@@ -8,15 +8,20 @@
 //   "SetState" of "Streaming" sets the filter from the command (every blob for the object-based
 //   technology) and starts streaming; any other state stops it. Until the first start command nothing is
 //   sent. Other messages get an error answer.
+// - Only the client's own process (the one that asked for the channel) may connect to the channel port.
 // - offer() sends a blob that the filter takes as one message (id 0, no reply wanted), exactly as it came.
-//   Sends never block: a blob the socket cannot take now waits in a bounded queue that a short timer keeps
-//   emptying; when the queue is full the oldest blobs are dropped, counted and logged at most once a second.
+//   Sends never block: a blob the socket cannot take now waits in a bounded queue, sent when the socket
+//   turns writable again; when the queue is full, or the service's queue budget (shared by every channel)
+//   is spent and this channel is the furthest behind, the oldest blobs are dropped, counted and logged at
+//   most once a second.
 // - keepsUp() and stalled() tell a source that is not paced by time whether to go on: it waits for a
 //   channel that is behind but moving, never for one whose client has stopped reading.
 // - The channel ends when the client goes away (its channel port or receive port hangs up, or a send to it
 //   fails) or when the service stops: both ports are invalidated (the channel port's socket file goes with
 //   it) and the listener is told once.
 #pragma once
+
+#include <sys/types.h>
 
 #include <chrono>
 #include <cstdint>
@@ -25,15 +30,17 @@
 #include <string>
 #include <string_view>
 
+#include "core/platform/LogRateLimit.h"
 #include "core/platform/MainQueue.h"
 #include "core/platform/MessagePort.h"
 #include "service/BasebandBlob.h"
 #include "service/BlobQueue.h"
 #include "service/LogCodeFilter.h"
+#include "service/QueueBudget.h"
 
 namespace velmar {
 
-class LogChannel : public std::enable_shared_from_this<LogChannel> {
+class LogChannel : public std::enable_shared_from_this<LogChannel>, private QueueBudget::Member {
   public:
     // What the channel tells the service it belongs to.
     class Listener {
@@ -53,6 +60,8 @@ class LogChannel : public std::enable_shared_from_this<LogChannel> {
         std::string receivePortName;
         std::string_view technology;
         bool objectBased = false;  // the technology's start command names no codes: stream every blob
+        pid_t clientPid = 0;       // the only process that may connect to the channel port; 0: any
+        QueueBudget* budget = nullptr;  // shared by the service's channels; outlives them
     };
 
     // Limits of the queue of blobs that the client's socket could not take yet.
@@ -62,13 +71,16 @@ class LogChannel : public std::enable_shared_from_this<LogChannel> {
     static constexpr std::size_t kKeepsUpBelow = 1024;
     // A channel that does not keep up and has sent nothing for this long has a stalled client.
     static constexpr double kStallSeconds = 0.5;
-    static constexpr double kRetrySeconds = 0.002;
     static constexpr double kDropReportSeconds = 1.0;
+    // Connections the channel port takes at once (its client needs one).
+    static constexpr std::size_t kChannelPortConnections = 4;
+    // Queued blobs sent per wake at most, so that one fast client does not hold the thread.
+    static constexpr int kFlushPerWake = 256;
 
     // Null on failure, with the protocol's error code and a reason.
     static std::shared_ptr<LogChannel> open(Settings settings, MainQueue& queue, Listener& listener,
                                             std::int32_t& error, std::string& reason);
-    ~LogChannel();
+    ~LogChannel() override;
     LogChannel(const LogChannel&) = delete;
     LogChannel& operator=(const LogChannel&) = delete;
 
@@ -101,6 +113,10 @@ class LogChannel : public std::enable_shared_from_this<LogChannel> {
     void send(ByteView bytes);
     void flush();
     void scheduleFlush();
+    // Tells the listener when a channel that is behind stops making progress (its client stalled).
+    void watchForStall();
+    std::size_t queuedBytes() const override { return queued_.bytes(); }
+    bool shedOldest() override;
     void noteDrops(std::size_t count);
     void reportDrops();
     void sendFailed(std::int32_t status);
@@ -111,16 +127,18 @@ class LogChannel : public std::enable_shared_from_this<LogChannel> {
     std::shared_ptr<MessagePort> channelPort_;
     std::shared_ptr<MessagePort> receivePort_;
     LogCodeFilter filter_;
-    BlobQueue queued_{kQueueBlobs, kQueueBytes};
+    BlobQueue queued_;
     bool streaming_ = false;
     bool ended_ = false;
-    MainQueue::Handle flushTimer_ = 0;
+    bool flushArmed_ = false;
+    MainQueue::Handle stallTimer_ = 0;
     MainQueue::Handle dropTimer_ = 0;
     std::chrono::steady_clock::time_point lastDropReport_{};
     std::chrono::steady_clock::time_point lastProgress_{};  // last send, or when the queue began
     std::uint64_t sent_ = 0;
     std::uint64_t dropped_ = 0;
     std::uint64_t unreportedDrops_ = 0;
+    LogRateLimit rejections_;
 };
 
 }  // namespace velmar

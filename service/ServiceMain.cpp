@@ -89,10 +89,15 @@ int runKxServerd(int argc, char** argv) {
     }
     PollMainQueue queue;
     MainQueue::setCurrent(&queue);
-    KxServer server(queue, options.technology, options.objectBased);
+    KxServer::Limits limits;
+    limits.channels = options.maxChannels;
+    limits.connections = options.maxConnections;
+    limits.queueBytes = options.queueMebibytes * 1024 * 1024;
+    KxServer server(queue, options.technology, options.objectBased, limits);
     // Every source's blobs enter the channels through the version adapter.
     VersionAdaptingSink adaptingSink(server);
-    switch (server.open()) {
+    std::string failure;
+    switch (server.open(&failure)) {
         case KxServer::OpenResult::Serving:
             break;
         case KxServer::OpenResult::AlreadyRunning:
@@ -101,7 +106,8 @@ int runKxServerd(int argc, char** argv) {
                                std::string(kKxServerControlPortName));
         case KxServer::OpenResult::Failed:
             close(signals);
-            return cannotStart("cannot listen on port " + std::string(kKxServerControlPortName));
+            return cannotStart("cannot listen on port " + std::string(kKxServerControlPortName) + ": " +
+                               failure);
     }
     if (!source->prepare(error)) {
         server.shutdown();

@@ -89,6 +89,34 @@ std::optional<double> parsePositiveNumber(std::string_view given) {
     return value;
 }
 
+std::optional<std::size_t> parseCount(std::string_view text, std::size_t most) {
+    if (text.empty() || text.size() > 9 || text.find_first_not_of("0123456789") != std::string_view::npos) {
+        return std::nullopt;
+    }
+    const std::size_t value = std::stoul(std::string(text));
+    if (value == 0 || value > most) {
+        return std::nullopt;
+    }
+    return value;
+}
+
+// A row for a whole-number option from 1 to most.
+CommandLineOption countOption(std::string_view name, std::string_view value, std::string help,
+                              std::size_t& target, std::size_t most) {
+    return {.name = name,
+            .value = value,
+            .help = std::move(help),
+            .apply = [name, most, &target](std::string_view given) -> std::string {
+                const std::optional<std::size_t> count = parseCount(given, most);
+                if (!count) {
+                    return std::string(name) + " needs a whole number from 1 to " + std::to_string(most) +
+                           ", not " + quoted(given);
+                }
+                target = *count;
+                return "";
+            }};
+}
+
 std::optional<std::uint64_t> parseUnsigned(std::string_view given) {
     const std::string text(given);
     if (text.empty() || text.find_first_not_of("0123456789") != std::string::npos) {
@@ -118,8 +146,9 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
             "the channels' log-code filters; SIGUSR1 logs the census of record versions seen (notice "
             "priority), as does the exit. "
             "SIGTERM or SIGINT closes every channel and the control port and exits with status 0. Exit "
-            "status 1: the service could not start (another kxserverd is already running, unreadable "
-            "input, device that cannot be opened or does not answer a version request); 2: usage error.",
+            "status 1: the service could not start (another kxserverd is already running in the runtime "
+            "directory, a runtime directory or control port that cannot be used, unreadable input, device "
+            "that cannot be opened or does not answer a version request); 2: usage error.",
     };
     commandLine.options = {
         {.name = "--source",
@@ -153,7 +182,8 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
          .value = "FILE",
          .help =
              "replay: the recorded log (hex blob file, DLF, raw diagnostic-port capture or snapshot; told "
-             "apart by extension, else by content)",
+             "apart by extension, else by content) of at most 256 MiB; a pipe or FIFO is read as it comes, "
+             "and replayed once its writer has finished",
          .apply = storesValue(options.input)},
         {.name = "--speed",
          .value = "X",
@@ -218,16 +248,28 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
          .synopsis = "[--scenario drive|walk|static]"},
         {.name = "--rate-multiplier",
          .value = "X",
-         .help = "sim: simulated time runs X times faster than the wall clock (default 1), and every logging "
-                 "rate with it",
+         .help = "sim: simulated time runs X times faster than the wall clock (default 1, at most 1000), and "
+                 "every logging rate with it; where the machine cannot keep up, simulated time runs as fast "
+                 "as it can while the service keeps answering",
          .apply = [&options](std::string_view value) -> std::string {
              const std::optional<double> rate = parsePositiveNumber(value);
-             if (!rate) {
-                 return "--rate-multiplier needs a positive number, not " + quoted(value);
+             if (!rate || *rate > ServiceOptionBounds::kMaxRateMultiplier) {
+                 return "--rate-multiplier needs a positive number of at most 1000, not " + quoted(value);
              }
              options.rateMultiplier = *rate;
              return "";
          }},
+        countOption("--max-channels", "N",
+                    "log channels open at once (default 32, at most 1024); more are refused with the reason",
+                    options.maxChannels, ServiceOptionBounds::kMaxChannels),
+        countOption("--max-connections", "N",
+                    "connections to the control port at once (default 64, at most 4096); more are closed and "
+                    "logged",
+                    options.maxConnections, ServiceOptionBounds::kMaxConnections),
+        countOption("--queue-memory", "MIB",
+                    "memory for the blobs that slow clients have not taken yet, all channels together (default "
+                    "64, at most 4096); past it the client furthest behind loses its oldest blobs",
+                    options.queueMebibytes, ServiceOptionBounds::kMaxQueueMebibytes),
         {.name = "--subscription",
          .value = "N",
          .help = "live: on a multi-SIM modem, the subscription (SIM) whose log packets stream (default: the "

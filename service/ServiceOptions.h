@@ -2,8 +2,8 @@
 //
 //   kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]
 //             [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
-//             [--scenario drive|walk|static] [--rate-multiplier X] [--subscription N]
-//             [--record FILE] | --list-devices
+//             [--scenario drive|walk|static] [--rate-multiplier X] [--max-channels N]
+//             [--max-connections N] [--queue-memory MIB] [--subscription N] [--record FILE] | --list-devices
 //
 // Contract: parseServiceOptions reads the arguments after the program name with the one command-line parser
 // (core/platform/CommandLine.h: "--name value" or "--name=value", --help anywhere wins, then --version).
@@ -39,6 +39,17 @@ struct ServiceOptions {
     std::string_view scenario = "drive";  // the simulated device's route: drive, walk or static
     double rateMultiplier = 1.0;          // simulated seconds per wall-clock second
     bool logStderr = false;
+    std::size_t maxChannels = 32;     // log channels open at once
+    std::size_t maxConnections = 64;  // connections to the control port at once
+    std::size_t queueMebibytes = 64;  // memory for blobs that clients have not taken yet, all channels
+};
+
+// The bounds of the numeric options.
+struct ServiceOptionBounds {
+    static constexpr double kMaxRateMultiplier = 1000.0;
+    static constexpr std::size_t kMaxChannels = 1024;
+    static constexpr std::size_t kMaxConnections = 4096;
+    static constexpr std::size_t kMaxQueueMebibytes = 4096;
 };
 
 struct ParsedServiceOptions {

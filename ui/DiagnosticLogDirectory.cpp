@@ -6,6 +6,7 @@
 
 #include <cerrno>
 #include <cstdlib>
+#include <cstring>
 
 namespace velmar {
 
@@ -21,9 +22,13 @@ std::string homeDirectory() {
     return "/";
 }
 
-bool isDirectory(const std::string& path) {
+// Makes the directory private when it is this user's and open to others.
+void narrow(const std::string& path) {
     struct stat info {};
-    return stat(path.c_str(), &info) == 0 && S_ISDIR(info.st_mode);
+    if (lstat(path.c_str(), &info) == 0 && S_ISDIR(info.st_mode) && info.st_uid == getuid() &&
+        (info.st_mode & 0077) != 0) {
+        chmod(path.c_str(), info.st_mode & 0700);
+    }
 }
 
 }  // namespace
@@ -35,21 +40,30 @@ std::string DiagnosticLogDirectory::path() {
     return base + "/velmar/diagnostics";
 }
 
-std::optional<std::string> DiagnosticLogDirectory::create() {
+std::optional<std::string> DiagnosticLogDirectory::create(std::string* why) {
     const std::string target = path();
+    const auto fail = [why](const std::string& reason) -> std::optional<std::string> {
+        if (why != nullptr) {
+            *why = reason;
+        }
+        return std::nullopt;
+    };
     // Every prefix that ends before a "/", then the whole path.
     for (std::size_t slash = target.find('/', 1);; slash = target.find('/', slash + 1)) {
         const std::string prefix = slash == std::string::npos ? target : target.substr(0, slash);
         if (!prefix.empty() && mkdir(prefix.c_str(), 0700) != 0 && errno != EEXIST) {
-            return std::nullopt;
+            return fail("cannot create directory " + prefix + ": " + std::strerror(errno));
         }
         if (slash == std::string::npos) {
             break;
         }
     }
-    if (!isDirectory(target)) {
-        return std::nullopt;
+    struct stat info {};
+    if (stat(target.c_str(), &info) != 0 || !S_ISDIR(info.st_mode)) {
+        return fail(target + " is not a directory");
     }
+    narrow(target.substr(0, target.rfind('/')));
+    narrow(target);
     return target;
 }
 

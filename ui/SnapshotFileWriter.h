@@ -2,8 +2,9 @@
 //
 // Contract: the file is written in place, not atomically (a second save to the same path replaces the first
 // one's contents); it is created with mode 0600, and an existing file is narrowed to 0600 before it is
-// overwritten. Answers false, leaving no half-written document behind where that can be helped, when the
-// value cannot be serialised or the file cannot be opened or fully written.
+// overwritten. Answers false with the reason in why when the value cannot be serialised (the file is not
+// touched), the file cannot be opened (a symbolic link at the path is not followed), or it cannot be fully
+// written (the partial file is removed).
 #pragma once
 
 #include <string>
@@ -12,6 +13,6 @@
 
 namespace velmar {
 
-bool writeSnapshotFile(const PlistValue& dictionary, const std::string& path);
+bool writeSnapshotFile(const PlistValue& dictionary, const std::string& path, std::string* why = nullptr);
 
 }  // namespace velmar

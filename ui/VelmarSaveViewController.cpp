@@ -68,11 +68,12 @@ std::string VelmarSaveViewController::snapshotPath(const std::string& directory,
 
 void VelmarSaveViewController::savePressed() {
     const PlistValue snapshot = snapshotDictionary(view_ ? view_->descriptionText() : std::string());
-    // A directory that cannot be made shows up as a failed write below.
-    const std::string directory = DiagnosticLogDirectory::create().value_or(DiagnosticLogDirectory::path());
-    const std::string path = snapshotPath(directory, Clock::now());
-    if (!writeSnapshotFile(snapshot, path)) {
+    std::string why;
+    const std::optional<std::string> directory = DiagnosticLogDirectory::create(&why);
+    const std::string path = snapshotPath(directory.value_or(DiagnosticLogDirectory::path()), Clock::now());
+    if (!directory || !writeSnapshotFile(snapshot, path, &why)) {
         SystemLog::log(kLogError, "Unable to write snapshot to %s", path.c_str());
+        SystemLog::log(kLogError, "Snapshot not written: %s", why.c_str());
         application_.showAlert(kFileErrorTitle, kFileErrorMessage, kFileErrorButton);
     }
     queueCloseSaveView();

@@ -6,6 +6,7 @@
 #pragma once
 
 #include <cstdint>
+#include <string>
 #include <string_view>
 
 namespace velmar {
@@ -52,6 +53,16 @@ VELMAR_KX_CONSTANT(kKxCellMonitorCellTypeNeighbor);
 // The service's control port.
 inline constexpr std::string_view kKxServerControlPortName = "com.velmar.kxserver";
 
+// A monitor's receive port: "com.velmar.Velmar.<pid>.BasebandStateReport.LogChannel", one per monitor
+// process, so that any number of monitors of one user (a GUI at the desk, a terminal over SSH) each hold a
+// channel of the one service.
+inline constexpr std::string_view kMonitorReceivePortPrefix = "com.velmar.Velmar.";
+inline constexpr std::string_view kMonitorReceivePortSuffix = ".BasebandStateReport.LogChannel";
+inline std::string monitorReceivePortName(long pid) {
+    return std::string(kMonitorReceivePortPrefix) + std::to_string(pid) +
+           std::string(kMonitorReceivePortSuffix);
+}
+
 // Control messages (XML property lists, message id 0). A client asks
 //   {"Request": "CreateLogChannel", "ReceivePort": <name of the client's local port>}
 // and the service answers
@@ -73,6 +84,7 @@ inline constexpr std::int32_t kKxErrorDomainServer = 1;
 inline constexpr std::int32_t kKxErrorBadRequest = 1;
 inline constexpr std::int32_t kKxErrorCannotReachReceivePort = 2;
 inline constexpr std::int32_t kKxErrorCannotOpenChannelPort = 3;
+inline constexpr std::int32_t kKxErrorTooManyChannels = 4;
 
 // Channel commands: {"GetTechnology": "GetTechnology"} answered with {"GetTechnology": <technology constant>};
 // the start command {"SetState": "Streaming", "SetOrvaneLogCodes": [...], "SetKxExtraCodes": [...]}.

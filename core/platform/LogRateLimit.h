@@ -17,7 +17,7 @@ class LogRateLimit {
   public:
     using Clock = std::chrono::steady_clock;
 
-    LogRateLimit(std::string topic, int priority, unsigned lines = 5, double windowSeconds = 1.0);
+    LogRateLimit(std::string topic, int priority, unsigned lines = 20, double windowSeconds = 1.0);
     ~LogRateLimit();
     LogRateLimit(const LogRateLimit&) = delete;
     LogRateLimit& operator=(const LogRateLimit&) = delete;

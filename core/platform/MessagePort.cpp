@@ -286,13 +286,13 @@ std::shared_ptr<MessagePort> MessagePort::createRemote(const std::string& name, 
     const int fd = newSocket();
     if (fd < 0) {
         if (failure != nullptr) {
-            *failure = std::string("cannot create a socket: ") + std::strerror(errno);
+            *failure = std::strerror(errno);
         }
         return nullptr;
     }
     if (!connectTo(fd, *path)) {
         if (failure != nullptr) {
-            *failure = "cannot connect to " + *path + ": " + std::strerror(errno);
+            *failure = std::strerror(errno);
         }
         close(fd);
         return nullptr;
@@ -621,6 +621,27 @@ void MessagePort::dropConnection(int fd) {
     }
 }
 
+void MessagePort::whenWritable(std::function<void()> ready) {
+    if (queue_ == nullptr || local_ || !valid_ || fd_ < 0) {
+        return;
+    }
+    if (writableWatch_ != 0) {
+        queue_->unwatch(writableWatch_);
+    }
+    std::weak_ptr<MessagePort> self = weak_from_this();
+    writableWatch_ = queue_->watchWritable(fd_, [self, ready = std::move(ready)] {
+        const std::shared_ptr<MessagePort> port = self.lock();
+        if (!port) {
+            return;
+        }
+        if (port->writableWatch_ != 0) {
+            port->queue_->unwatch(port->writableWatch_);
+            port->writableWatch_ = 0;
+        }
+        ready();
+    });
+}
+
 void MessagePort::readRemote() {
     const std::shared_ptr<MessagePort> keep = shared_from_this();
     for (int handled = 0; handled < kMessagesPerWake; ++handled) {
@@ -747,6 +768,10 @@ void MessagePort::stopWatching() {
     if (acceptRetry_ != 0) {
         queue_->cancelTimer(acceptRetry_);
         acceptRetry_ = 0;
+    }
+    if (writableWatch_ != 0) {
+        queue_->unwatch(writableWatch_);
+        writableWatch_ = 0;
     }
     for (auto& [fd, connection] : connections_) {
         for (MainQueue::Handle* watch : {&connection.watch, &connection.writeWatch}) {

@@ -80,7 +80,8 @@ class MessagePort : public std::enable_shared_from_this<MessagePort> {
     static std::shared_ptr<MessagePort> createLocal(const std::string& name, MessageCallback callback,
                                                     bool* alreadyExists, LocalMode mode = LocalMode::Feeding,
                                                     std::string* failure = nullptr);
-    // Null when nothing listens at the name; the reason in failure when given.
+    // Null when nothing listens at the name; the reason in failure when given ("Connection refused", "Too
+    // many open files", a runtime directory's problem).
     static std::shared_ptr<MessagePort> createRemote(const std::string& name, std::string* failure = nullptr);
 
     // Removes the socket files that ended processes left behind in the runtime directory: those named
@@ -95,6 +96,10 @@ class MessagePort : public std::enable_shared_from_this<MessagePort> {
     // Local ports: connections from any other process are refused from now on.
     void acceptOnlyFrom(pid_t pid) { onlyPid_ = pid; }
     void setMaxConnections(std::size_t count) { maxConnections_ = count == 0 ? 1 : count; }
+
+    // Remote ports: runs ready once on the dispatch queue when the connection can take a message again (or
+    // has failed); replaces an earlier request.
+    void whenWritable(std::function<void()> ready);
 
     std::int32_t sendRequest(std::int32_t messageId, ByteView data, double sendTimeout, double receiveTimeout,
                              bool wantReply, std::optional<PlistData>* reply);
@@ -146,6 +151,7 @@ class MessagePort : public std::enable_shared_from_this<MessagePort> {
     MainQueue* queue_ = nullptr;
     MainQueue::Handle listenWatch_ = 0;
     MainQueue::Handle acceptRetry_ = 0;
+    MainQueue::Handle writableWatch_ = 0;  // remote ports: whenWritable
     double acceptBackoff_ = 0;  // seconds; 0 while accepting works
     std::map<int, Connection> connections_;
     std::size_t maxConnections_ = kDefaultMaxConnections;

@@ -39,22 +39,25 @@ TelephonyServiceConnection::Status TelephonyServiceConnection::createLogChannel(
     request->set(kKxReceivePortKey, receivePortName);
     const auto encoded = serializeXml(request);
     if (!encoded) {
-        return {kTransportDomain, kMessagePortTransportError};
+        return {kTransportDomain, kMessagePortTransportError, {}};
     }
     std::optional<PlistData> replyData;
     const std::int32_t sent =
         control_->sendRequest(0, *encoded, kRequestTimeoutSeconds, kRequestTimeoutSeconds, true, &replyData);
     if (sent != kMessagePortSuccess) {
-        return {kTransportDomain, sent};
+        return {kTransportDomain, sent, {}};
     }
     const auto reply = replyData ? parsePropertyList(*replyData) : std::nullopt;
     const PlistDictionaryRef fields = reply ? reply->dictionary() : nullptr;
     if (!fields) {
-        return {kTransportDomain, kMessagePortTransportError};
+        return {kTransportDomain, kMessagePortTransportError, {}};
     }
     Status status;
     status.domain = static_cast<std::int32_t>(fields->get(kKxDomainKey).integerValue().value_or(0));
     status.error = static_cast<std::int32_t>(fields->get(kKxErrorKey).integerValue().value_or(kKxErrorBadRequest));
+    if (const std::string* reason = fields->get(kKxReasonKey).string()) {
+        status.reason = *reason;
+    }
     if (status.error == 0 && remotePortName) {
         if (const std::string* port = fields->get(kKxChannelPortKey).string()) {
             *remotePortName = *port;

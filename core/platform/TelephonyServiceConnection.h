@@ -25,6 +25,7 @@ public:
     struct Status {
         std::int32_t domain = 0;
         std::int32_t error = 0;
+        std::string reason;  // the service's own words on a refusal, for diagnostics
     };
 
     static std::unique_ptr<TelephonyServiceConnection> create(NotificationCallback callback, MainQueue& queue);

@@ -1,5 +1,7 @@
 #include "service/sim/SimSource.h"
 
+#include <algorithm>
+
 #include "core/platform/StringFormat.h"
 #include "core/platform/SystemLog.h"
 #include "service/sim/TechnologyEmitter.h"
@@ -69,6 +71,7 @@ void SimSource::start(MainQueue& queue, BlobSink& sink) {
     settings.startTimestamp = basebandTimestampOf(std::chrono::system_clock::now());
     baseband_ = std::make_unique<sim::SimulatedBaseband>(settings);
     started_ = Clock::now();
+    simulated_ = 0;
     pump();
     timer_ = queue.repeating(kTickSeconds, [this, alive = std::weak_ptr<bool>(alive_)] {
         const std::shared_ptr<bool> live = alive.lock();
@@ -87,9 +90,30 @@ void SimSource::stop() {
 }
 
 void SimSource::pump() {
-    const double wall = std::chrono::duration<double>(Clock::now() - started_).count();
-    baseband_->runUntil(wall * settings_.rateMultiplier,
-                        [this](ByteView blob) { sink_->deliver(frameBasebandBlob(blob)); });
+    const Clock::time_point began = Clock::now();
+    const double target = std::chrono::duration<double>(began - started_).count() * settings_.rateMultiplier;
+    const auto deliver = [this](ByteView blob) { sink_->deliver(frameBasebandBlob(blob)); };
+    while (simulated_ < target) {
+        simulated_ = std::min(target, simulated_ + kSliceSimulatedSeconds);
+        baseband_->runUntil(simulated_, deliver);
+        if (std::chrono::duration<double>(Clock::now() - began).count() >= kPumpBudgetSeconds) {
+            break;
+        }
+    }
+    const double behindWallSeconds = (target - simulated_) / settings_.rateMultiplier;
+    if (behindWallSeconds > kMostBehindSeconds) {
+        // The wall clock's lead is given up: simulated time goes on from where it is, as fast as it can.
+        started_ +=
+            std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(behindWallSeconds));
+        if (!saidBehind_) {
+            saidBehind_ = true;
+            SystemLog::log(
+                kLogError,
+                "sim: this machine cannot run the simulated baseband %g times faster than the wall "
+                "clock; simulated time runs as fast as it can",
+                settings_.rateMultiplier);
+        }
+    }
 }
 
 }  // namespace velmar

@@ -1,6 +1,10 @@
 // SimSource: the simulated baseband as the service's source. Simulated time follows the wall clock, times
 // the rate multiplier: a repeating timer on the queue (every 20 ms of wall time) runs the simulation up to
 // the time due and delivers every blob it produced, as a baseband would, whether or not a channel streams.
+// One run takes at most kPumpBudgetSeconds of the thread, in slices of simulated time, so that the service
+// answers its clients and signals in between; where the machine cannot keep up with the rate, simulated time
+// falls behind by at most kMostBehindSeconds of wall time and then runs as fast as the machine lets it (said
+// once in the log).
 //
 // Contract: prepare() fails when the technology has no simulator. start() takes the wall clock as the
 // baseband's time 0 (its timestamps continue from the current date), stop() cancels the timer and nothing
@@ -27,6 +31,9 @@ class SimSource : public BasebandSource {
         double rateMultiplier = 1.0;
     };
     static constexpr double kTickSeconds = 0.02;
+    static constexpr double kPumpBudgetSeconds = 0.02;
+    static constexpr double kSliceSimulatedSeconds = 0.5;
+    static constexpr double kMostBehindSeconds = 1.0;
 
     explicit SimSource(Settings settings);
     ~SimSource() override;
@@ -51,6 +58,8 @@ class SimSource : public BasebandSource {
     std::shared_ptr<bool> alive_;  // tasks scheduled on the queue hold it weakly
     MainQueue::Handle timer_ = 0;
     Clock::time_point started_;
+    double simulated_ = 0;  // seconds of simulated time run so far
+    bool saidBehind_ = false;
 };
 
 }  // namespace velmar

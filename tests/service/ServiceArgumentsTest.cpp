@@ -93,11 +93,22 @@ TEST_F(ServiceArgumentsTest, TheSimulatorsOptionsAreCheckedAndApplyOnlyToIt) {
         {{"--scenario", "run"}, "kxserverd: unknown scenario \"run\" (drive, walk or static) (see --help)\n"},
         {{"--scenario"}, "kxserverd: --scenario needs a value (see --help)\n"},
         {{"--rate-multiplier", "0"},
-         "kxserverd: --rate-multiplier needs a positive number, not \"0\" (see --help)\n"},
+         "kxserverd: --rate-multiplier needs a positive number of at most 1000, not \"0\" (see --help)\n"},
         {{"--rate-multiplier=-2"},
-         "kxserverd: --rate-multiplier needs a positive number, not \"-2\" (see --help)\n"},
+         "kxserverd: --rate-multiplier needs a positive number of at most 1000, not \"-2\" (see --help)\n"},
         {{"--rate-multiplier", "fast"},
-         "kxserverd: --rate-multiplier needs a positive number, not \"fast\" (see --help)\n"},
+         "kxserverd: --rate-multiplier needs a positive number of at most 1000, not \"fast\" (see --help)\n"},
+        {{"--rate-multiplier", "1e9"},
+         "kxserverd: --rate-multiplier needs a positive number of at most 1000, not \"1e9\" (see --help)\n"},
+        {{"--rate-multiplier", "1000.5"},
+         "kxserverd: --rate-multiplier needs a positive number of at most 1000, not \"1000.5\" (see "
+         "--help)\n"},
+        {{"--max-channels", "0"},
+         "kxserverd: --max-channels needs a whole number from 1 to 1024, not \"0\" (see --help)\n"},
+        {{"--max-connections", "5000"},
+         "kxserverd: --max-connections needs a whole number from 1 to 4096, not \"5000\" (see --help)\n"},
+        {{"--queue-memory", "1.5"},
+         "kxserverd: --queue-memory needs a whole number from 1 to 4096, not \"1.5\" (see --help)\n"},
         {{"--source", "replay", "--input", "x.hex", "--scenario", "walk"},
          "kxserverd: --scenario does not apply to --source replay (see --help)\n"},
         {{"--source", "live", "--device", "/dev/null", "--rate-multiplier", "2"},
@@ -158,7 +169,8 @@ TEST_F(ServiceArgumentsTest, UnreadableInputExitsOneAndLeavesNoSocket) {
     EXPECT_EQ(result.exitCode, 1);
     EXPECT_EQ(result.err,
               "kxserverd: /nonexistent/velmar/none.hex: cannot open: No such file or directory\n");
-    EXPECT_TRUE(filesIn(runtime_.path()).empty());
+    // Only the service lock's file, which stays by design: no socket.
+    EXPECT_EQ(filesIn(runtime_.path()), std::vector<std::string>{"com.velmar.kxserver.lock"});
 }
 
 TEST_F(ServiceArgumentsTest, ALiveDeviceMustBeACharacterDeviceOrFifo) {
@@ -202,6 +214,19 @@ TEST(ServiceOptions, ParsesEveryOptionInBothForms) {
     EXPECT_EQ(sim.options.rateMultiplier, 4.0);
     EXPECT_EQ(parseServiceOptions({"--seed", "18446744073709551616"}).error,
               "--seed needs a non-negative integer, not \"18446744073709551616\"");
+    EXPECT_EQ(parseServiceOptions({"--rate-multiplier", "1000"}).options.rateMultiplier, 1000.0);
+
+    // The limits apply to every source; their defaults suit a handful of monitors.
+    EXPECT_EQ(sim.options.maxChannels, 32U);
+    EXPECT_EQ(sim.options.maxConnections, 64U);
+    EXPECT_EQ(sim.options.queueMebibytes, 64U);
+    const ParsedServiceOptions limited =
+        parseServiceOptions({"--source", "replay", "--input", "x", "--max-channels=3", "--max-connections",
+                             "7", "--queue-memory", "2"});
+    ASSERT_EQ(limited.error, "");
+    EXPECT_EQ(limited.options.maxChannels, 3U);
+    EXPECT_EQ(limited.options.maxConnections, 7U);
+    EXPECT_EQ(limited.options.queueMebibytes, 2U);
 }
 
 TEST(ServiceOptions, TheLiveSourcesOwnOptions) {

@@ -46,7 +46,7 @@ bool KxTestClient::connect(bool readBlobs) {
         connection->createLogChannel(receivePortName_, &channelPort);
     if (status.error != 0 || !channelPort || channelPort->empty()) {
         error_ = "CreateLogChannel failed: domain " + std::to_string(status.domain) + ", error " +
-                 std::to_string(status.error);
+                 std::to_string(status.error) + ", reason: " + status.reason;
         return false;
     }
     channelPortName_ = *channelPort;

@@ -556,10 +556,12 @@ TEST_F(QtGuiTest, AFailedWriteShowsTheFileErrorAlertAndTheScreenCloses) {
     ASSERT_NE(app_->saveView(), nullptr);
     tap(app_->saveView()->saveButton());
     ASSERT_TRUE(QTest::qWaitFor([&] { return app_->shell().saveViewController() == nullptr; }, 2000));
-    ASSERT_EQ(capture.textsAt(kLogError).size(), 1u);
+    ASSERT_EQ(capture.textsAt(kLogError).size(), 2u);
     EXPECT_EQ(
         capture.textsAt(kLogError)[0].rfind("Unable to write snapshot to " + state_.path() + "/blocked/", 0),
         0u);
+    EXPECT_EQ(capture.textsAt(kLogError)[1], "Snapshot not written: cannot create directory " +
+                                                 state_.path() + "/blocked/velmar: Not a directory");
     QMessageBox* alert = app_->alert();
     ASSERT_NE(alert, nullptr);
     EXPECT_TRUE(alert->isVisible());

@@ -1,7 +1,9 @@
 // The snapshot save flow without a toolkit: the shell's one save screen, the controller's table and file.
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 
+#include <csignal>
 #include <cstdlib>
 #include <filesystem>
 
@@ -381,6 +383,42 @@ TEST_F(SaveFlowTest, TheDirectoryIsMadePrivateAndTheFileOwnerOnly) {
     EXPECT_EQ(fileMode(diagnostics() + "/VelmarSnapshot-1790000000.velmar"), 0600);
 }
 
+TEST_F(SaveFlowTest, ExistingDirectoriesOpenToOthersAreNarrowed) {
+    ASSERT_EQ(mkdir((state_.path() + "/velmar").c_str(), 0755), 0);
+    ASSERT_EQ(mkdir(diagnostics().c_str(), 0777), 0);
+    ASSERT_EQ(chmod(diagnostics().c_str(), 0777), 0);  // past the umask
+    Clock::setNowForTesting(1'790'000'000.0);
+    auto controller = makeController(entries({describedEntry("a")}));
+    controller.savePressed();
+    EXPECT_EQ(fileMode(state_.path() + "/velmar"), 0700);
+    EXPECT_EQ(fileMode(diagnostics()), 0700);
+    // The state home itself is the user's business, not the monitor's.
+    EXPECT_NE(fileMode(state_.path()), -1);
+}
+
+TEST_F(SaveFlowTest, AWriteCutShortRemovesItsPartialFileAndLogsTheReason) {
+    // A file-size limit stops the write after 100 bytes, whoever runs the test (root included).
+    rlimit previous{};
+    ASSERT_EQ(getrlimit(RLIMIT_FSIZE, &previous), 0);
+    const auto previousHandler = signal(SIGXFSZ, SIG_IGN);
+    rlimit small = previous;
+    small.rlim_cur = 100;
+    ASSERT_EQ(setrlimit(RLIMIT_FSIZE, &small), 0);
+    Clock::setNowForTesting(1'790'000'000.0);
+    testing::LogCapture capture;
+    auto controller = makeController(entries({describedEntry(std::string(500, 'x').c_str())}));
+    controller.savePressed();
+    setrlimit(RLIMIT_FSIZE, &previous);
+    signal(SIGXFSZ, previousHandler);
+    const std::string path = diagnostics() + "/VelmarSnapshot-1790000000.velmar";
+    EXPECT_EQ(capture.textsAt(kLogError),
+              (std::vector<std::string>{"Unable to write snapshot to " + path,
+                                        "Snapshot not written: cannot write " + path + ": File too large"}));
+    EXPECT_TRUE(filesIn(diagnostics()).empty()) << "the partial file stayed";
+    EXPECT_EQ(presenter_.alerts,
+              std::vector<std::string>{"File Error / Unable to write file to disk / Close"});
+}
+
 TEST_F(SaveFlowTest, AFailedWriteIsLoggedShownAsAnAlertAndTheScreenClosesAnyway) {
     // A file where the state directory should be: nothing can be created below it.
     testing::writeWholeFile(state_.path() + "/blocked", "not a directory");
@@ -392,8 +430,10 @@ TEST_F(SaveFlowTest, AFailedWriteIsLoggedShownAsAnAlertAndTheScreenClosesAnyway)
     presenter_.view.text = "lost";
     shell_.saveViewController()->savePressed();
     EXPECT_EQ(capture.textsAt(kLogError),
-              std::vector<std::string>{"Unable to write snapshot to " + state_.path() +
-                                       "/blocked/velmar/diagnostics/VelmarSnapshot-1790000000.velmar"});
+              (std::vector<std::string>{"Unable to write snapshot to " + state_.path() +
+                                            "/blocked/velmar/diagnostics/VelmarSnapshot-1790000000.velmar",
+                                        "Snapshot not written: cannot create directory " + state_.path() +
+                                            "/blocked/velmar: Not a directory"}));
     EXPECT_EQ(presenter_.alerts,
               std::vector<std::string>{"File Error / Unable to write file to disk / Close"});
     queue_.runFor(0.05);

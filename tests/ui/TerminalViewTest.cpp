@@ -420,9 +420,7 @@ TEST_F(TerminalFrontEndTest, TheSaveFormWritesTheTypedDescriptionAndCloses) {
     }
     frontEnd.handleKey(TerminalKey::of(TerminalKey::Kind::Backspace));
     frontEnd.handleKey(TerminalKey::character(U'm'));
-    // Return hides the keyboard focus: the focus moves to Save, and a second Enter saves.
-    frontEnd.handleKey(TerminalKey::of(TerminalKey::Kind::Enter));
-    EXPECT_EQ(frontEnd.saveForm()->focus(), TerminalSaveForm::Focus::Save);
+    // Return in the description saves.
     Clock::setNowForTesting(1'790'000'003.0);
     frontEnd.handleKey(TerminalKey::of(TerminalKey::Kind::Enter));
     ASSERT_TRUE(frontEnd.queue().runUntil([&] { return frontEnd.saveForm() == nullptr; }, 2.0));
@@ -449,10 +447,13 @@ TEST_F(TerminalFrontEndTest, AFailedSaveShowsTheAlertOverThePanesUntilClosed) {
     frontEnd.handleKey(TerminalKey::of(TerminalKey::Kind::Enter));
     ASSERT_TRUE(frontEnd.queue().runUntil([&] { return frontEnd.saveForm() == nullptr; }, 2.0));
     EXPECT_TRUE(frontEnd.isAlertShown());
-    ASSERT_EQ(capture.textsAt(kLogError).size(), 1u);
+    // The fixed line, then the reason.
+    ASSERT_EQ(capture.textsAt(kLogError).size(), 2u);
     EXPECT_EQ(
         capture.textsAt(kLogError)[0].rfind("Unable to write snapshot to " + state_.path() + "/blocked/", 0),
         0u);
+    EXPECT_EQ(capture.textsAt(kLogError)[1], "Snapshot not written: cannot create directory " +
+                                                 state_.path() + "/blocked/velmar: Not a directory");
     const auto lines = frame(frontEnd, 12, 40);
     // A box of 28 + 6 = 34 columns at column 3, rows 3 to 8.
     EXPECT_EQ(lines[4], "   │           File Error           │   ");

@@ -24,24 +24,29 @@ std::string isoLocalTime(double secondsSince1970) {
     return stamp + zone;
 }
 
-// The followed path and every path above it, root first: "/A/B" → "/", "/A", "/A/B".
-std::vector<std::string> panePaths(const std::string& followed) {
-    std::vector<std::string> paths{"/"};
-    std::string current = "/";
+// The followed path without empty parts ("/A//B/" → "/A/B"), and where each pane's path ends in it, root
+// first: "/A/B" → 1 ("/"), 2 ("/A"), 4 ("/A/B").
+std::shared_ptr<const std::string> normalisedPath(const std::string& followed,
+                                                  std::vector<std::size_t>& ends) {
+    auto path = std::make_shared<std::string>("/");
+    path->reserve(followed.size() + 1);
+    ends.push_back(1);
     std::size_t start = 0;
     while (start < followed.size()) {
-        const std::size_t end = followed.find('/', start);
-        const std::string component = followed.substr(start, end == std::string::npos ? std::string::npos : end - start);
-        if (!component.empty()) {
-            current = joinDisplayPath(current, component);
-            paths.push_back(current);
-        }
+        std::size_t end = followed.find('/', start);
         if (end == std::string::npos) {
-            break;
+            end = followed.size();
+        }
+        if (end > start) {
+            if (path->size() > 1) {
+                path->push_back('/');
+            }
+            path->append(followed, start, end - start);
+            ends.push_back(path->size());
         }
         start = end + 1;
     }
-    return paths;
+    return path;
 }
 
 }  // namespace
@@ -49,8 +54,11 @@ std::vector<std::string> panePaths(const std::string& followed) {
 HeadlessFrontEnd::HeadlessFrontEnd(GeneratorFactory factory, const std::string& followedPath, std::FILE* output)
     : shell_(std::move(factory), queue_), output_(output) {
     MainQueue::setCurrent(&queue_);
-    for (const std::string& path : panePaths(followedPath)) {
-        panes_.push_back(std::make_unique<HeadlessPane>(path));
+    std::vector<std::size_t> ends;
+    const std::shared_ptr<const std::string> followed = normalisedPath(followedPath, ends);
+    panes_.reserve(ends.size());
+    for (const std::size_t end : ends) {
+        panes_.push_back(std::make_unique<HeadlessPane>(followed, end));
     }
     shell_.setRedrawObserver([this] { printStatusLine(); });
 }

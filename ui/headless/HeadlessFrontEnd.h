@@ -19,10 +19,19 @@
 
 namespace velmar {
 
+// A pane of the followed path: its path is the first `length` characters of the whole followed path, which
+// the panes share, made into a string of its own only when asked for; so a path of any number of parts costs
+// memory in proportion to its length, not to its length squared.
 class HeadlessPane : public Pane {
 public:
-    explicit HeadlessPane(std::string path) : path_(std::move(path)) {}
-    const std::string& path() const override { return path_; }
+  HeadlessPane(std::shared_ptr<const std::string> followed, std::size_t length)
+      : followed_(std::move(followed)), length_(length) {}
+  const std::string& path() const override {
+      if (path_.empty()) {
+          path_ = followed_->substr(0, length_);
+      }
+      return path_;
+  }
     void reloadWithNode(const VelmarModelNodeRef& node) override { node_ = node; }
     void setStatus(const std::string& status, bool isLoading) override {
         status_ = status;
@@ -33,10 +42,12 @@ public:
     bool isLoading() const { return loading_; }
 
 private:
-    std::string path_;
-    VelmarModelNodeRef node_;
-    std::string status_;
-    bool loading_ = false;
+  std::shared_ptr<const std::string> followed_;
+  std::size_t length_;
+  mutable std::string path_;
+  VelmarModelNodeRef node_;
+  std::string status_;
+  bool loading_ = false;
 };
 
 class HeadlessFrontEnd : public NavigationStack {

@@ -106,7 +106,9 @@ void TerminalSaveForm::handleKey(const TerminalKey& key) {
                     cursor_ = static_cast<int>(text_.size());
                     break;
                 case Kind::Enter:
+                    // Return ends the description and saves, as the user who typed it means; Esc cancels.
                     controller_->textFieldShouldReturn();
+                    controller_->savePressed();
                     break;
                 case Kind::Down:
                     moveFocus(1);

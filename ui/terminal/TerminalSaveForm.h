@@ -4,9 +4,9 @@
 //
 // Contract: the form opens with the description field focused. Tab and Shift+Tab move the focus (field,
 // history, Save, Cancel); typing edits the field (← → Home End Backspace Delete move and delete within it);
-// Enter in the field hides the keyboard focus (the focus moves to Save); Enter on a history row hides it too
-// and does nothing else; Enter on Save saves, on Cancel cancels; Esc cancels. While the form is up it takes
-// every key. detach() cuts it from its controller, which is released right after.
+// Enter in the field saves (the field gives up its focus first); Enter on a history row hides the keyboard
+// focus and does nothing else; Enter on Save saves, on Cancel cancels; Esc cancels. While the form is up it
+// takes every key. detach() cuts it from its controller, which is released right after.
 #pragma once
 
 #include <string>

@@ -1,0 +1,31 @@
+#include "service/QueueBudget.h"
+
+#include <algorithm>
+
+namespace velmar {
+
+void QueueBudget::join(Member& member) {
+    if (std::find(members_.begin(), members_.end(), &member) == members_.end()) {
+        members_.push_back(&member);
+    }
+}
+
+void QueueBudget::leave(Member& member) {
+    std::erase(members_, &member);
+}
+
+void QueueBudget::enforce() {
+    while (used_ > limit_) {
+        Member* furthestBehind = nullptr;
+        for (Member* member : members_) {
+            if (furthestBehind == nullptr || member->queuedBytes() > furthestBehind->queuedBytes()) {
+                furthestBehind = member;
+            }
+        }
+        if (furthestBehind == nullptr || !furthestBehind->shedOldest()) {
+            return;
+        }
+    }
+}
+
+}  // namespace velmar
