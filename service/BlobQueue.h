@@ -37,7 +37,7 @@ class BlobQueue {
     static constexpr std::size_t kBlobOverhead = 64;
 
   private:
-    static constexpr std::size_t kMaxSpares = 64;
+    static constexpr std::size_t kMaxSpares = 16;
     static constexpr std::size_t kMaxSpareCapacity = 4096;
 
     std::size_t maxBlobs_;

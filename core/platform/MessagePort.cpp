@@ -445,12 +445,12 @@ void MessagePort::acceptConnections() {
             }
             if (errno != EAGAIN && errno != EWOULDBLOCK) {
                 acceptFailed(errno);
+            } else if (acceptBackoff_ > 0) {
+                // Every waiting connection taken: the trouble is over.
+                acceptBackoff_ = 0;
+                SystemLog::log(kLogError, "Accepting connections on port %s again", name_.c_str());
             }
             return;
-        }
-        if (acceptBackoff_ > 0) {
-            acceptBackoff_ = 0;
-            SystemLog::log(kLogError, "Accepting connections on port %s again", name_.c_str());
         }
         Connection connection;
         connection.fd = fd;
@@ -473,6 +473,7 @@ void MessagePort::acceptFailed(int error) {
     } else {
         acceptBackoff_ = std::min(acceptBackoff_ * 2, kLongestAcceptBackoffSeconds);
     }
+    // While connections still wait, the trouble goes on (one accepted between failures does not end it).
     if (queue_ == nullptr) {
         return;
     }

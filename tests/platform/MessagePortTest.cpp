@@ -18,58 +18,14 @@
 #include "core/platform/PollMainQueue.h"
 #include "core/platform/RuntimeDirectory.h"
 #include "tests/support/LogCapture.h"
+#include "tests/support/RawPeer.h"
 #include "tests/support/TestPaths.h"
 
 namespace velmar {
 namespace {
 
-constexpr std::uint32_t kReplyWanted = 1;
-
-// A peer that speaks the packet format by hand: message id, flags, payload.
-class RawPeer {
-  public:
-    explicit RawPeer(const std::string& path) {
-        fd_ = socket(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC | SOCK_NONBLOCK, 0);
-        sockaddr_un address{};
-        address.sun_family = AF_UNIX;
-        std::strncpy(address.sun_path, path.c_str(), sizeof address.sun_path - 1);
-        connected_ =
-            fd_ >= 0 && connect(fd_, reinterpret_cast<const sockaddr*>(&address), sizeof address) == 0;
-    }
-    ~RawPeer() {
-        if (fd_ >= 0) {
-            close(fd_);
-        }
-    }
-    bool connected() const { return connected_; }
-    // false when the socket would block.
-    bool send(std::int32_t messageId, std::uint32_t flags, const std::string& payload) {
-        std::vector<std::uint8_t> packet(8 + payload.size());
-        std::memcpy(packet.data(), &messageId, 4);
-        std::memcpy(packet.data() + 4, &flags, 4);
-        std::memcpy(packet.data() + 8, payload.data(), payload.size());
-        return ::send(fd_, packet.data(), packet.size(), MSG_DONTWAIT | MSG_NOSIGNAL) ==
-               static_cast<ssize_t>(packet.size());
-    }
-    bool sendEmpty() { return ::send(fd_, "", 0, MSG_DONTWAIT | MSG_NOSIGNAL) == 0; }
-    // The payload of the next packet, if one is there; "<hung up>" when the other side closed.
-    std::optional<std::string> receive() {
-        char buffer[65536];
-        const ssize_t got = recv(fd_, buffer, sizeof buffer, MSG_DONTWAIT);
-        if (got == 0 || (got < 0 && errno != EAGAIN && errno != EWOULDBLOCK && errno != EINTR)) {
-            return std::string("<hung up>");  // closed, or reset with our packets unread
-        }
-        if (got < 8) {
-            return std::nullopt;
-        }
-        return std::string(buffer + 8, buffer + got);
-    }
-    int fd() const { return fd_; }
-
-  private:
-    int fd_ = -1;
-    bool connected_ = false;
-};
+constexpr std::uint32_t kReplyWanted = testing::RawPeer::kReplyWanted;
+using testing::RawPeer;
 
 class MessagePortTest : public ::testing::Test {
   protected:

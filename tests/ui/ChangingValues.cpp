@@ -112,4 +112,20 @@ std::string busiestPane(const std::vector<LeafValues>& snapshots) {
     return best;
 }
 
+std::string livelyPaneOf(const std::string& technology) {
+    if (technology == "gsm") {
+        return "/UMTS/UMTS RR Info";
+    }
+    if (technology == "utran") {
+        return "/Serving Cell Info";
+    }
+    if (technology == "cdma") {
+        return "/1x/Radio";
+    }
+    if (technology == "ifx") {
+        return "/Serving Cell";
+    }
+    return "/Serving Cell/Connected mode LTE Intra-frequency Measurement";
+}
+
 }  // namespace velmar::testing

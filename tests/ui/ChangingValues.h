@@ -19,6 +19,9 @@ LeafValues leavesOf(const VelmarModelNodeRef& root);
 LeafValues leavesOfJson(const PlistValue& root);
 // The pane's path, or empty when no value changed.
 std::string busiestPane(const std::vector<LeafValues>& snapshots);
+// A pane of the simulated baseband of technology (gsm, lte, utran, cdma, ifx) whose values change at almost
+// every display tick at any seed (its levels fade as the device moves), for tests that watch one pane.
+std::string livelyPaneOf(const std::string& technology);
 // "/A/B" → {"A", "B"}.
 std::vector<std::string> pathComponents(const std::string& path);
 

@@ -1,10 +1,20 @@
 // velmar --headless as a user runs it, against a real kxserverd: it connects and shows a tree that changes,
-// survives the service being killed and reconnects when it is back, lets a second monitor find its port
-// taken, redraws at most once per display tick, and ends cleanly on SIGTERM; and the same against a live
-// modem (the emulator on a pseudo-terminal) that kxserverd finds by itself and that is unplugged and
-// plugged in again.
+// velmar --headless as a user runs it, against a real kxserverd: it connects and shows a tree that changes,
+// survives the service being killed and shows living values again when it is back (every technology), lets
+// four monitors share one service, finds a truly taken port name taken, clears the ports of killed
+// monitors, redraws at most once per display tick whatever other clients do, and ends promptly on SIGTERM
+// even under a flood; and the same against a live modem (the emulator on a pseudo-terminal) that kxserverd
+// finds by itself and that is unplugged and plugged in again.
+#include <fcntl.h>
 #include <gtest/gtest.h>
 #include <signal.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
+#include <sys/un.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstring>
 
 #include <chrono>
 #include <cstdint>
@@ -20,10 +30,14 @@
 #include "tests/support/KxTestClient.h"
 #include "tests/support/LiveModem.h"
 #include "tests/support/ServiceProcess.h"
+#include "tests/support/ProcessStats.h"
+#include "tests/support/RawPeer.h"
 #include "tests/support/TestPaths.h"
 #include "tests/ui/ChangingValues.h"
 #include "tests/ui/KxServerProcess.h"
 #include "tools/modem-emulator/ModemEmulator.h"
+
+extern char** environ;
 
 namespace velmar {
 namespace {
@@ -141,22 +155,187 @@ TEST_F(HeadlessEndToEndTest, SurvivesTheServiceBeingKilledAndReconnectsWhenItIsB
               std::string::npos);
 }
 
-TEST_F(HeadlessEndToEndTest, ASecondMonitorFindsItsPortTakenAndKeepsTrying) {
+std::string receivePortFileOf(const std::string& runtime, pid_t pid) {
+    return runtime + "/com.velmar.Velmar." + std::to_string(pid) + ".BasebandStateReport.LogChannel";
+}
+
+bool fileExists(const std::string& path) {
+    struct stat info {};
+    return lstat(path.c_str(), &info) == 0;
+}
+
+TEST_F(HeadlessEndToEndTest, FourMonitorsShareOneService) {
     testing::KxServerProcess service(runtime_.path());
     ASSERT_TRUE(service.start()) << service.description();
-    auto first = startMonitor(outputs_.path());
-    ASSERT_TRUE(first->waitForOutput([](const std::string& out) { return connectedLines(out) >= 1; }, 30));
+    testing::TemporaryDirectory outputs[4];
+    std::vector<std::unique_ptr<testing::BackgroundProcess>> monitors;
+    for (const testing::TemporaryDirectory& directory : outputs) {
+        monitors.push_back(startMonitor(directory.path()));
+    }
+    for (const auto& monitor : monitors) {
+        ASSERT_TRUE(
+            monitor->waitForOutput([](const std::string& out) { return connectedLines(out) >= 2; }, 30))
+            << monitor->errorOutput();
+    }
+    for (const auto& monitor : monitors) {
+        EXPECT_EQ(monitor->errorOutput().find("Local messsage port already exists"), std::string::npos);
+        EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** Created ports (send="), 1u)
+            << monitor->errorOutput();
+        // Each under its own name.
+        EXPECT_TRUE(fileExists(receivePortFileOf(runtime_.path(), monitor->pid())));
+        const std::vector<HeadlessLine> lines = headlessLines(monitor->standardOutput());
+        EXPECT_TRUE(lines.back().connected);
+        EXPECT_EQ(lines.back().status.rfind("Updated ", 0), 0u) << lines.back().status;
+    }
+    // A monitor that goes removes its port; the others stream on.
+    monitors[0]->sendSignal(SIGTERM);
+    ASSERT_EQ(monitors[0]->waitForExit(10), std::optional<int>(0));
+    EXPECT_FALSE(fileExists(receivePortFileOf(runtime_.path(), monitors[0]->pid())));
+    const std::size_t before = connectedLines(monitors[3]->standardOutput());
+    EXPECT_TRUE(monitors[3]->waitForOutput(
+        [&](const std::string& out) { return connectedLines(out) >= before + 1; }, 10));
+}
 
-    testing::TemporaryDirectory secondOutputs;
-    auto second = startMonitor(secondOutputs.path());
-    ASSERT_TRUE(second->waitForError("Local messsage port already exists", 10)) << second->errorOutput();
-    EXPECT_FALSE(second->waitForExit(1).has_value()) << "the second monitor gave up";
-    EXPECT_EQ(second->errorOutput().find(" ***** Created ports"), std::string::npos);
-    // The first one is not disturbed: it keeps redrawing with data.
-    const std::size_t firstConnected = connectedLines(first->standardOutput());
-    EXPECT_TRUE(first->waitForOutput(
-        [&](const std::string& out) { return connectedLines(out) >= firstConnected + 2; }, 15));
-    EXPECT_EQ(first->errorOutput().find("INVALIDATED"), std::string::npos) << first->errorOutput();
+TEST_F(HeadlessEndToEndTest, AReceivePortNameTrulyTakenIsReportedAndTheMonitorKeepsTrying) {
+    // Another listener holds the name this monitor process will use (its pid's): a child process binds it,
+    // then becomes the monitor, the listener still open in its hands but no longer its own.
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    const std::string errPath = outputs_.file("velmar.err");
+    std::vector<std::string> environmentStrings;
+    for (char** entry = environ; *entry != nullptr; ++entry) {
+        environmentStrings.push_back(*entry);
+    }
+    for (const std::string& assignment : environment()) {
+        environmentStrings.push_back(assignment);
+    }
+    std::vector<char*> envp;
+    for (std::string& assignment : environmentStrings) {
+        envp.push_back(assignment.data());
+    }
+    envp.push_back(nullptr);
+    const int errFd = open(errPath.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0600);
+    const int nullFd = open("/dev/null", O_RDWR | O_CLOEXEC);
+    const pid_t child = fork();
+    if (child == 0) {
+        const std::string path = receivePortFileOf(runtime_.path(), getpid());
+        const int listener = socket(AF_UNIX, SOCK_SEQPACKET, 0);
+        sockaddr_un address{};
+        address.sun_family = AF_UNIX;
+        std::strncpy(address.sun_path, path.c_str(), sizeof address.sun_path - 1);
+        if (bind(listener, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0 ||
+            listen(listener, 8) != 0) {
+            _exit(90);
+        }
+        dup2(nullFd, STDIN_FILENO);
+        dup2(nullFd, STDOUT_FILENO);
+        dup2(errFd, STDERR_FILENO);
+        char program[] = VELMAR_PATH;
+        char headless[] = "--headless";
+        char logStderr[] = "--log-stderr";
+        char* argv[] = {program, headless, logStderr, nullptr};
+        execve(program, argv, envp.data());
+        _exit(127);
+    }
+    close(errFd);
+    close(nullFd);
+    ASSERT_GT(child, 0);
+    const auto errorOutput = [&] { return testing::readWholeFile(errPath); };
+    EXPECT_TRUE(testing::waitUntil(
+        [&] { return errorOutput().find("<3> Local messsage port already exists") != std::string::npos; },
+        10))
+        << errorOutput();
+    int status = 0;
+    EXPECT_EQ(waitpid(child, &status, WNOHANG), 0) << "the monitor gave up";
+    EXPECT_EQ(errorOutput().find(" ***** Created ports"), std::string::npos);
+    EXPECT_NE(errorOutput().find("<3> Could not create the ports necessary"), std::string::npos);
+    kill(child, SIGTERM);
+    waitpid(child, &status, 0);
+    EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0);
+}
+
+TEST_F(HeadlessEndToEndTest, TheReceivePortOfAKilledMonitorIsClearedByTheNext) {
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    auto killed = startMonitor(outputs_.path());
+    ASSERT_TRUE(killed->waitForOutput([](const std::string& out) { return connectedLines(out) >= 1; }, 30));
+    const std::string leftBehind = receivePortFileOf(runtime_.path(), killed->pid());
+    killed->sendSignal(SIGKILL);
+    killed->waitForExit(10);
+    ASSERT_TRUE(fileExists(leftBehind));
+    testing::TemporaryDirectory nextOutputs;
+    auto next = startMonitor(nextOutputs.path());
+    ASSERT_TRUE(next->waitForOutput([](const std::string& out) { return connectedLines(out) >= 1; }, 30));
+    EXPECT_FALSE(fileExists(leftBehind));
+}
+
+TEST_F(HeadlessEndToEndTest, ANeverReadingClientDoesNotStopTheMonitorsRedraws) {
+    testing::KxServerProcess service(runtime_.path(), "lte", {"--rate-multiplier", "4", "--log-stderr"});
+    ASSERT_TRUE(service.start()) << service.description();
+    auto monitor = startMonitor(outputs_.path());
+    ASSERT_TRUE(monitor->waitForOutput([](const std::string& out) { return connectedLines(out) >= 1; }, 30));
+    // A client sends request after request and reads none of the answers.
+    testing::RawPeer greedy(runtime_.path() + "/com.velmar.kxserver");
+    ASSERT_TRUE(greedy.connected());
+    const std::size_t before = connectedLines(monitor->standardOutput());
+    const auto start = std::chrono::steady_clock::now();
+    int sent = 0;
+    while (std::chrono::steady_clock::now() - start < std::chrono::seconds(7)) {
+        if (greedy.send(0, testing::RawPeer::kReplyWanted, "<plist><dict/></plist>")) {
+            ++sent;
+        } else {
+            std::this_thread::sleep_for(std::chrono::milliseconds(5));
+        }
+    }
+    // Every tick of those seven seconds brought a redraw with new data.
+    const std::size_t redraws = connectedLines(monitor->standardOutput()) - before;
+    std::printf("%d requests left unread; %zu redraws in 7 s\n", sent, redraws);
+    EXPECT_GE(redraws, 3u);
+    EXPECT_EQ(monitor->errorOutput().find("INVALIDATED"), std::string::npos) << monitor->errorOutput();
+    EXPECT_NE(service.errorOutput().find("it does not read its replies"), std::string::npos)
+        << service.errorOutput();
+}
+
+TEST_F(HeadlessEndToEndTest, AFloodedMonitorHonoursSigtermPromptly) {
+    // The service replays a large capture as fast as the monitor takes it: the monitor's port never runs dry.
+    const std::string capture = std::string(VELMAR_SOURCE_DIR) + "/samples/captures/mixed-large-1.qmdl";
+    testing::KxServerProcess service(runtime_.path(), "gsm",
+                                     {"--source", "replay", "--fast", "--loop", "--input", capture});
+    ASSERT_TRUE(service.start()) << service.description();
+    auto monitor = startMonitor(outputs_.path());
+    ASSERT_TRUE(monitor->waitForOutput([](const std::string& out) { return connectedLines(out) >= 2; }, 30))
+        << monitor->errorOutput();
+    const auto signalled = std::chrono::steady_clock::now();
+    monitor->sendSignal(SIGTERM);
+    const std::optional<int> status = monitor->waitForExit(10);
+    const double latency =
+        std::chrono::duration<double>(std::chrono::steady_clock::now() - signalled).count();
+    std::printf("the flooded monitor ended %.0f ms after SIGTERM\n", 1000 * latency);
+    ASSERT_EQ(status, std::optional<int>(0));
+    EXPECT_LT(latency, 5.0);
+}
+
+TEST_F(HeadlessEndToEndTest, AFollowedPathOfThousandsOfPartsCostsMemoryInProportionToItsLength) {
+    // No service: the launch line comes at once. The followed panes are made before it.
+    const auto residentWith = [&](const std::string& path) -> std::size_t {
+        testing::TemporaryDirectory directory;
+        testing::BackgroundProcess monitor(VELMAR_PATH, {"--headless", "--path", path}, directory.path(),
+                                           environment());
+        EXPECT_TRUE(monitor.waitForOutput([](const std::string& out) { return !out.empty(); }, 30));
+        const std::size_t kib = testing::residentKibOf(monitor.pid());
+        monitor.sendSignal(SIGTERM);
+        EXPECT_EQ(monitor.waitForExit(10), std::optional<int>(0));
+        return kib;
+    };
+    std::string deep;
+    for (int i = 0; i < 30000; ++i) {
+        deep += "/x";
+    }
+    const std::size_t shallow = residentWith("/x");
+    const std::size_t many = residentWith(deep);
+    std::printf("resident memory: %zu KiB with one part, %zu KiB with 30000\n", shallow, many);
+    // Each prefix written out would take 30000 × 30000 bytes; the panes share one copy.
+    EXPECT_LT(many, shallow + 32 * 1024);
 }
 
 TEST_F(HeadlessEndToEndTest, RedrawsAtMostOncePerDisplayTickUnderAFastStream) {
@@ -321,24 +500,44 @@ TEST_F(HeadlessEndToEndTest, AReplayedCaptureShowsItsTrueValues) {
 class HeadlessTechnologyTest : public HeadlessEndToEndTest,
                                public ::testing::WithParamInterface<const char*> {};
 
-TEST_P(HeadlessTechnologyTest, TheSimulatedBasebandShowsALivingTree) {
-    testing::KxServerProcess service(runtime_.path(), GetParam(), {"--rate-multiplier", "4"});
-    ASSERT_TRUE(service.start()) << service.description();
+TEST_P(HeadlessTechnologyTest, TheSimulatedBasebandShowsALivingTreeAgainAfterTheServiceIsKilled) {
+    auto service = std::make_unique<testing::KxServerProcess>(
+        runtime_.path(), GetParam(), std::vector<std::string>{"--rate-multiplier", "4"});
+    ASSERT_TRUE(service->start()) << service->description();
     auto monitor = startMonitor(outputs_.path());
+    // The connected redraws from line `from` on, and whether their values changed.
     std::vector<testing::LeafValues> snapshots;
-    const bool changed = monitor->waitForOutput(
-        [&](const std::string& out) {
+    const auto changesFrom = [&](std::size_t from) {
+        return [&, from](const std::string& out) {
             snapshots.clear();
-            for (const HeadlessLine& line : headlessLines(out)) {
-                if (line.connected && line.tree.isDictionary()) {
-                    snapshots.push_back(testing::leavesOfJson(line.tree));
+            const std::vector<HeadlessLine> lines = headlessLines(out);
+            for (std::size_t i = from; i < lines.size(); ++i) {
+                if (lines[i].connected && lines[i].tree.isDictionary()) {
+                    snapshots.push_back(testing::leavesOfJson(lines[i].tree));
                 }
             }
             return snapshots.size() >= 2 && !testing::busiestPane(snapshots).empty();
-        },
-        40);
-    ASSERT_TRUE(changed) << snapshots.size() << " connected redraws\n" << monitor->errorOutput();
+        };
+    };
+    ASSERT_TRUE(monitor->waitForOutput(changesFrom(0), 40)) << snapshots.size() << " connected redraws\n"
+                                                            << monitor->errorOutput();
     EXPECT_GE(snapshots.back().size(), 5u) << "only " << snapshots.back().size() << " values shown";
+
+    // The service dies as a crash would and comes back with another seed: the values live again.
+    service->kill();
+    ASSERT_TRUE(monitor->waitForError(" ***** INVALIDATED 0x", 10)) << monitor->errorOutput();
+    const std::size_t linesBefore = testing::linesOf(monitor->standardOutput()).size();
+    service = std::make_unique<testing::KxServerProcess>(
+        runtime_.path(), GetParam(), std::vector<std::string>{"--rate-multiplier", "4", "--seed", "7"});
+    const auto restarted = std::chrono::steady_clock::now();
+    ASSERT_TRUE(service->start()) << service->description();
+    ASSERT_TRUE(monitor->waitForOutput(changesFrom(linesBefore), 40))
+        << snapshots.size() << " connected redraws since the restart, none changed\n"
+        << monitor->errorOutput();
+    std::printf("%s: values changed again %.1f s after the service restarted\n", GetParam(),
+                std::chrono::duration<double>(std::chrono::steady_clock::now() - restarted).count());
+    EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** Created ports (send="), 2u)
+        << monitor->errorOutput();
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryTechnology, HeadlessTechnologyTest,

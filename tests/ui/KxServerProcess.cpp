@@ -4,6 +4,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <utility>
 
 namespace velmar::testing {
@@ -59,7 +60,9 @@ std::unique_ptr<KxServerProcess> KxServerProcess::replaying(std::string runtimeD
 }
 
 std::vector<std::string> KxServerProcess::arguments() const {
-    std::vector<std::string> arguments = source_;
+    const bool sourceGiven =
+        std::find(extraArguments_.begin(), extraArguments_.end(), "--source") != extraArguments_.end();
+    std::vector<std::string> arguments = sourceGiven ? std::vector<std::string>{} : source_;
     arguments.insert(arguments.end(), {"--technology", technology_});
     arguments.insert(arguments.end(), extraArguments_.begin(), extraArguments_.end());
     return arguments;

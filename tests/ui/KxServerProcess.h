@@ -1,6 +1,6 @@
 // KxServerProcess: a real kxserverd for the end-to-end tests of the user interfaces, in its own runtime
-// directory, on the simulated baseband of the given technology (or replaying a recording); it can be killed
-// and started again.
+// directory, on the simulated baseband of the given technology (or replaying a recording, or another
+// source); it can be killed and started again.
 #pragma once
 
 #include <memory>
@@ -13,7 +13,8 @@ namespace velmar::testing {
 
 class KxServerProcess {
   public:
-    // extraArguments go to the simulated baseband only (e.g. {"--rate-multiplier", "10"}).
+    // extraArguments follow the technology (e.g. {"--rate-multiplier", "10"}); the source is the simulated
+    // baseband unless they name another one.
     explicit KxServerProcess(std::string runtimeDirectory, std::string technology = "lte",
                              std::vector<std::string> extraArguments = {});
     // A service replaying a recorded log as fast as the first client takes it.
@@ -28,6 +29,8 @@ class KxServerProcess {
     // SIGKILL, as a crashing service would go; waits for the process.
     void kill();
     bool isRunning() const { return process_ != nullptr; }
+    // What the running service wrote to standard error (with --log-stderr, its log).
+    std::string errorOutput() const { return process_ ? process_->errorOutput() : std::string(); }
     // The command line in use, for messages.
     std::string description() const;
 
