@@ -2,12 +2,12 @@
 
 #include <charconv>
 
+#include "LogGenerator/KeptDisplay.h"
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/BasebandPacket.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/Resources.h"
 #include "core/platform/SystemLog.h"
-#include "core/platform/plist/PlistCodec.h"
 
 namespace velmar {
 
@@ -70,23 +70,17 @@ void ORVLogGenerator2::updateWithData(ByteView data) {
     }
 }
 
-std::optional<PlistValue> ORVLogGenerator2::loadTemplate() const {
-    const auto path = Resources::pathForResource(pListName, "plist");
-    return path ? readDictionaryFile(*path) : std::nullopt;
-}
-
 bool ORVLogGenerator2::adoptKeptDisplay(const StateDict& state, const PlistValue& display) {
-    // A display that another technology's template built has none of this generator's sections: it gives
-    // way to this technology's own, which the caller builds.
-    const PlistValue keptTemplate = state->get(state_keys::kTemplate);
-    if (!keptTemplate.isNone()) {
-        if (const std::optional<PlistValue> own = loadTemplate(); own && !(*own == keptTemplate)) {
-            SystemLog::log(kLogNotice, "The kept display was built from another template; building %s",
-                           pListName.c_str());
-            state->remove(state_keys::kDisplay);
-            state->remove(state_keys::kTemplate);
-            return false;
-        }
+    // A display that another technology's generator built has none of this generator's sections: it gives
+    // way to this technology's own, which the caller builds (from this generator's template, not the one
+    // the other generator left in the state).
+    if (const std::optional<PlistValue> own = loadTemplate(pListName);
+        own && !builtFromTemplate(display, *own)) {
+        SystemLog::log(kLogNotice, "The kept display was built from another template; building %s",
+                       pListName.c_str());
+        state->remove(state_keys::kDisplay);
+        state->remove(state_keys::kTemplate);
+        return false;
     }
     bindSections(display);
     boundDisplay_ = display.dictionary();
@@ -124,7 +118,7 @@ PlistValue ORVLogGenerator2::getDisplayFromState(const StateDict& state) {
     }
     PlistValue templateValue = state->get(state_keys::kTemplate);
     if (templateValue.isNone()) {
-        std::optional<PlistValue> loaded = loadTemplate();
+        std::optional<PlistValue> loaded = loadTemplate(pListName);
         if (!loaded) {
             SystemLog::log(kLogError, "Cannot load template for display");
             return PlistValue();

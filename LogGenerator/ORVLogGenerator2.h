@@ -9,14 +9,13 @@
 // "Display", binds each decoder to the container under its section name, and returns null; later calls
 // return that tree. A display already in the state that this generator did not build (the state outlives
 // the generator across channel restarts) gets this generator's decoders bound to its sections, as the build
-// would bind them, the first time the generator sees it; one that another technology's template built is
-// replaced by this technology's own (built as above). generateLogUsingState moves the blobs of the interval
-// under "DisplayState" and appends a history entry. The start command lists the plain and the extra codes of
-// the class index.
+// would bind them, the first time the generator sees it; one that another technology's generator built (see
+// KeptDisplay.h) is replaced by this technology's own, built as above. generateLogUsingState moves the blobs
+// of the interval under "DisplayState" and appends a history entry. The start command lists the plain and the
+// extra codes of the class index.
 #pragma once
 
 #include <memory>
-#include <optional>
 #include <string>
 
 #include "LogGenerator/ClassIndex.h"
@@ -54,17 +53,16 @@ protected:
     std::shared_ptr<ClassIndex> cIndex;
 
 private:
-    struct CreationNoted {};
-    std::optional<PlistValue> loadTemplate() const;
-    // Binds the decoders to the kept display; false (display and template removed) when another template
-    // built it.
-    bool adoptKeptDisplay(const StateDict& state, const PlistValue& display);
-    void bindSections(const PlistValue& displayValue);
-    static CreationNoted noteCreation(const ClassIndex* classIndex);
-    ORVLogGenerator2(CreationNoted, std::string templateName, std::shared_ptr<ClassIndex> classIndex);
+  struct CreationNoted {};
+  // Binds the decoders to the kept display; false (display and template removed) when another template
+  // built it.
+  bool adoptKeptDisplay(const StateDict& state, const PlistValue& display);
+  void bindSections(const PlistValue& displayValue);
+  static CreationNoted noteCreation(const ClassIndex* classIndex);
+  ORVLogGenerator2(CreationNoted, std::string templateName, std::shared_ptr<ClassIndex> classIndex);
 
-    // The display tree the decoders are bound to (not owned: the state owns it).
-    std::weak_ptr<PlistDictionary> boundDisplay_;
+  // The display tree the decoders are bound to (not owned: the state owns it).
+  std::weak_ptr<PlistDictionary> boundDisplay_;
 };
 
 }  // namespace velmar

@@ -1,9 +1,13 @@
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 
+#include <unordered_set>
+
+#include "LogGenerator/C2K/C2KDisplaySetter.h"
 #include "LogGenerator/C2K/C2KLogCodes.h"
 #include "LogGenerator/C2K/C2KLogParsers.h"
 #include "LogGenerator/C2K/C2KSortedPilots.h"
 #include "LogGenerator/C2K/C2KStateKeys.h"
+#include "LogGenerator/KeptDisplay.h"
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/BasebandPacket.h"
 #include "core/platform/KxServerProtocol.h"
@@ -61,8 +65,7 @@ PlistDictionaryRef C2KLogGenerator::getDisplayFromState(const StateDict& state) 
     }
     PlistDictionaryRef templateDictionary = state->get(kTemplate).dictionary();
     if (!templateDictionary) {
-        const auto path = Resources::pathForResource(kTemplateName, "plist");
-        const std::optional<PlistValue> loaded = path ? readDictionaryFile(*path) : std::nullopt;
+        const std::optional<PlistValue> loaded = loadTemplate(kTemplateName);
         if (!loaded || !loaded->isDictionary()) {
             SystemLog::log(kLogError, "Cannot load C2K template for display");
             return nullptr;
@@ -79,7 +82,58 @@ PlistDictionaryRef C2KLogGenerator::getDisplayFromState(const StateDict& state) 
     return display;
 }
 
+namespace {
+
+void collectDictionaries(const PlistValue& value, std::unordered_set<const PlistDictionary*>& into) {
+    if (const PlistDictionaryRef& dictionary = value.dictionary()) {
+        into.insert(dictionary.get());
+        for (const auto& entry : *dictionary) {
+            collectDictionaries(entry.second, into);
+        }
+    } else if (const PlistArrayRef& array = value.array()) {
+        for (const PlistValue& element : *array) {
+            collectDictionaries(element, into);
+        }
+    }
+}
+
+// Whether the lookup's places lie in display, as they do when both were built together.
+bool lookupShowsIn(const PlistDictionary& lookup, const PlistDictionaryRef& display) {
+    std::unordered_set<const PlistDictionary*> shown;
+    collectDictionaries(PlistValue(display), shown);
+    for (const auto& [displayKey, places] : lookup) {
+        if (const PlistArrayRef& list = places.array(); list && !list->empty()) {
+            const PlistDictionaryRef& place = list->at(0).dictionary();
+            return place && shown.count(place->get(c2k::kPlaceDictionaryKey).dictionary().get()) != 0;
+        }
+    }
+    return true;
+}
+
+}  // namespace
+
+void C2KLogGenerator::forgetForeignDisplay(const StateDict& state) {
+    using namespace state_keys;
+    const PlistDictionaryRef display = state->get(kDisplay).dictionary();
+    if (!display || verifiedDisplay_.lock() == display) {
+        return;
+    }
+    // The state outlives generators: a display that came without this generator's lookup into it was built
+    // by another technology's generator, and the template and lookup beside it are not this display's.
+    const PlistDictionaryRef lookup = state->get(c2k::kLookupKey).dictionary();
+    if (!lookup || !lookupShowsIn(*lookup, display)) {
+        SystemLog::log(kLogNotice, "The kept display was built from another template; building %s",
+                       kTemplateName);
+        state->remove(kDisplay);
+        state->remove(kTemplate);
+        state->remove(c2k::kLookupKey);
+        return;
+    }
+    verifiedDisplay_ = display;
+}
+
 void C2KLogGenerator::updateState(const StateDict& state, ByteView data) {
+    forgetForeignDisplay(state);
     getDisplayFromState(state);
     // Held here: parsers add entries to the state, which may move the entry that holds the lookup.
     const PlistDictionaryRef lookup = state->get(c2k::kLookupKey).dictionary();

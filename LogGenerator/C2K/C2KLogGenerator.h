@@ -6,7 +6,8 @@
 // the string "_sorted" is copied as it stands; any other string V is a display key: the display holds an
 // empty string under the label, and the lookup's array under V gains the place {"key": label, "dict": that
 // display dictionary}. Other values are skipped. The display, the lookup and an empty "ExtraInfo" are built
-// once, when the state holds no display, and kept in the state ("Display", "Lookup", "ExtraInfo").
+// once, when the state holds no display, and kept in the state ("Display", "Lookup", "ExtraInfo"); a display
+// that another technology's generator left in the state is replaced by this one's.
 // Contract (intake): a blob under 13 bytes is ignored; a leading 0x81 marks a two-byte prefix that is cut
 // off; a log type other than 1 is logged ("Invalid log type: %x. Dropping.") and the packet is processed all
 // the same (type 0xFF adds 0xFF0000 to the code, so it matches none of the eight codes). A packet of one of
@@ -41,6 +42,13 @@ class C2KLogGenerator : public ORVLogGenerator {
     // The state's display, built (with the lookup) from the template when the state holds none; null when
     // the template cannot be loaded ("Cannot load C2K template for display").
     static PlistDictionaryRef getDisplayFromState(const StateDict& state);
+
+  private:
+    // Removes from the state a display (with its template and lookup) that another technology's generator
+    // built, the first time this generator sees it, so that getDisplayFromState builds this one's.
+    void forgetForeignDisplay(const StateDict& state);
+
+    std::weak_ptr<PlistDictionary> verifiedDisplay_;  // the display found to be this generator's own
 };
 
 }  // namespace velmar

@@ -165,6 +165,53 @@ TEST_F(GuiEndToEndTest, ConnectsShowsChangingValuesSurvivesTheServiceDyingAndRec
     app_->applicationWillTerminate();
 }
 
+TEST_F(GuiEndToEndTest, ValuesLiveAgainAfterEveryRestartOfTheServiceWhateverItsTechnology) {
+    // One window; the service is killed and started again with another seed, then with each other
+    // technology in turn. Each time the values of a lively pane must change on screen again.
+    const std::vector<std::pair<std::string, std::string>> phases = {
+        {"lte", "1"}, {"lte", "2"}, {"gsm", "3"}, {"utran", "4"}, {"cdma", "5"}, {"ifx", "6"}};
+    std::unique_ptr<testing::KxServerProcess> service;
+    for (std::size_t phase = 0; phase < phases.size(); ++phase) {
+        const auto& [technology, seed] = phases[phase];
+        if (service) {
+            service->kill();
+            ASSERT_TRUE(QTest::qWaitFor([&] { return !app_->shell().model()->isConnected(); }, 5000));
+        }
+        service = std::make_unique<testing::KxServerProcess>(
+            runtime_.path(), technology, std::vector<std::string>{"--rate-multiplier", "4", "--seed", seed});
+        QElapsedTimer clock;
+        clock.start();
+        ASSERT_TRUE(service->start()) << service->description();
+        if (phase == 0) {
+            app_ = std::make_unique<VelmarApp>(
+                [](std::string_view name) { return LogGenerator::generatorFromTechnology(name); }, queue_);
+            app_->applicationDidFinishLaunching(false);
+        }
+        ASSERT_TRUE(QTest::qWaitFor([&] { return app_->shell().model()->isConnected(); }, 10000))
+            << technology;
+        // This technology's tree arrives with the first redraw that follows.
+        const std::string pane = testing::livelyPaneOf(technology);
+        ASSERT_TRUE(QTest::qWaitFor([&] { return openPath(pane); }, 15000)) << technology << ": " << pane;
+        bool changed = false;
+        for (int redraw = 0; redraw < 6 && !changed; ++redraw) {
+            const std::vector<std::string> before = shownValues();
+            ASSERT_TRUE(nextRedraw(15000)) << technology;
+            if (top().path() != pane) {
+                ASSERT_TRUE(openPath(pane)) << pane << " came back";
+                continue;
+            }
+            changed = shownValues() != before;
+        }
+        EXPECT_TRUE(changed) << technology << " (seed " << seed << "): the values of " << pane
+                             << " did not change on screen";
+        std::printf("%s, seed %s: values changed on screen %.1f s after the service started\n",
+                    technology.c_str(), seed.c_str(), clock.elapsed() / 1000.0);
+        app_->window()->grab().save(QString::fromStdString(
+            std::string(VELMAR_BINARY_DIR) + "/screenshots/gui-restart-" + technology + "-" + seed + ".png"));
+    }
+    app_->applicationWillTerminate();
+}
+
 }  // namespace
 }  // namespace velmar
 

@@ -274,6 +274,79 @@ TEST_F(TerminalTmuxTest, ConnectsShowsChangingValuesSurvivesTheServiceDyingAndRe
     EXPECT_TRUE(session.waitFor([&](const auto&) { return !session.alive(); }, 5));
 }
 
+// Watches the open pane over up to `redraws` redraws; true when its values changed on screen. A pane that
+// went (a list entry) is opened again.
+bool valuesChangeOnScreen(TmuxSession& session, const std::function<bool()>& reopen, int redraws) {
+    std::vector<std::string> lines;
+    for (int i = 0; i < redraws; ++i) {
+        const std::vector<std::string> before = session.screen();
+        if (!session.waitFor(
+                [&](const auto& shown) {
+                    return footer(shown) != footer(before) && startsWith(footer(shown), "   Updated ");
+                },
+                15, &lines)) {
+            return false;
+        }
+        if (lines[0] != before[0]) {
+            if (!reopen()) {
+                return false;
+            }
+            continue;
+        }
+        if (body(lines) != body(before)) {
+            return true;
+        }
+    }
+    return false;
+}
+
+TEST_F(TerminalTmuxTest, ValuesLiveAgainAfterEveryRestartOfTheServiceWhateverItsTechnology) {
+    // One monitor session; the service is killed and started again with another seed, then with each
+    // other technology in turn. Each time the values of a lively pane must change on screen again.
+    const std::vector<std::pair<std::string, std::string>> phases = {
+        {"lte", "1"}, {"lte", "2"}, {"gsm", "3"}, {"utran", "4"}, {"cdma", "5"}, {"ifx", "6"}};
+    std::unique_ptr<testing::KxServerProcess> service;
+    TmuxSession session;
+    for (std::size_t phase = 0; phase < phases.size(); ++phase) {
+        const auto& [technology, seed] = phases[phase];
+        if (service) {
+            service->kill();
+        }
+        service = std::make_unique<testing::KxServerProcess>(
+            runtime_.path(), technology, std::vector<std::string>{"--rate-multiplier", "4", "--seed", seed});
+        const auto restarted = std::chrono::steady_clock::now();
+        ASSERT_TRUE(service->start()) << service->description();
+        if (phase == 0) {
+            ASSERT_TRUE(session.start(environment(), {VELMAR_PATH, "--terminal"}));
+        }
+        const std::string pane = testing::livelyPaneOf(technology);
+        const std::string first = testing::pathComponents(pane).front();
+        // The monitor reconnects within a retry and shows this technology's tree.
+        ASSERT_TRUE(session.waitFor(
+            [&](const auto& shown) {
+                session.keys({"Escape"});
+                for (std::size_t i = 1; i + 1 < shown.size(); ++i) {
+                    if (startsWith(shown[i], " " + first + " ") && startsWith(footer(shown), "   Updated ")) {
+                        return true;
+                    }
+                }
+                return false;
+            },
+            20))
+            << technology << ": " << first << " never shown";
+        ASSERT_TRUE(openPath(session, pane)) << technology << ": " << pane;
+        EXPECT_TRUE(valuesChangeOnScreen(
+            session, [&] { return openPath(session, pane); }, 6))
+            << technology << " (seed " << seed << "): the values of " << pane << " did not change";
+        std::printf("%s, seed %s: values changed on screen %.1f s after the service started\n",
+                    technology.c_str(), seed.c_str(),
+                    std::chrono::duration<double>(std::chrono::steady_clock::now() - restarted).count());
+        keepScreen("terminal-restart-" + technology + "-" + seed + ".txt", session.screen());
+    }
+    session.keys({"q"});
+    EXPECT_TRUE(session.waitFor([&](const auto&) { return !session.alive(); }, 5));
+}
+
 TEST_F(TerminalTmuxTest, ScreenLayoutKeysResizeSaveAndQuit) {
     allowSaving();
     testing::KxServerProcess service(runtime_.path());
@@ -301,7 +374,7 @@ TEST_F(TerminalTmuxTest, ScreenLayoutKeysResizeSaveAndQuit) {
     ASSERT_TRUE(session.waitFor(
         [](const auto& shown) { return shown.size() == kRows && shown[0].size() == kColumns - 1; }, 3));
 
-    // s opens the save form; typing, Return, then Enter on Save writes the snapshot and closes the form.
+    // s opens the save form; typing and Return write the snapshot and close the form.
     session.keys({"s"});
     ASSERT_TRUE(session.waitFor(
         [](const auto& shown) {
@@ -315,8 +388,7 @@ TEST_F(TerminalTmuxTest, ScreenLayoutKeysResizeSaveAndQuit) {
         3, &lines));
     keepScreen("terminal-save-form.txt", lines);
     session.keys({"-l", "Cell edge, tunnel"});
-    session.keys({"Enter"});
-    session.keys({"Enter"});
+    session.keys({"Enter"});  // Return in the description saves
     ASSERT_TRUE(session.waitFor(
         [](const auto& shown) {
             for (const auto& line : shown) {
