@@ -1,5 +1,6 @@
 // velmar-decode as a user runs it: as a process, with its output parsed as JSON.
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <string>
 #include <vector>
@@ -87,6 +88,24 @@ TEST(DecodeTool, UnreadableInputNamesTheFile) {
     EXPECT_EQ(badHex.exitCode, 2);
     EXPECT_EQ(lines(badHex.err).size(), 1u);
     EXPECT_NE(badHex.err.find("bad-digit.hex:3:"), std::string::npos) << badHex.err;
+}
+
+TEST(DecodeTool, ADirectoryIsSaidToBeOneWhateverTheFormat) {
+    testing::TemporaryDirectory directory;
+    const std::string named = directory.file("trace.velmar");
+    ASSERT_EQ(mkdir(named.c_str(), 0700), 0);
+    const auto snapshot = runProcess({kDecode, "--technology", "lte", named});
+    EXPECT_EQ(snapshot.exitCode, 2);
+    EXPECT_EQ(snapshot.err, "velmar-decode: " + named + ": Is a directory\n");
+    for (const char* format : {"velmar", "hex", "dlf", "qmdl", "auto"}) {
+        const auto result =
+            runProcess({kDecode, "--technology", "lte", "--format", format, directory.path()});
+        EXPECT_EQ(result.exitCode, 2) << format;
+        EXPECT_NE(result.err.find(directory.path() + ": "), std::string::npos)
+            << format << ": " << result.err;
+        EXPECT_NE(result.err.find("Is a directory"), std::string::npos) << format << ": " << result.err;
+        EXPECT_EQ(lines(result.err).size(), 1u) << result.err;
+    }
 }
 
 TEST(DecodeTool, StartCommandIsPrintedAsJson) {
