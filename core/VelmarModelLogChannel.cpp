@@ -51,6 +51,10 @@ bool VelmarModel::createPorts() {
     }
     std::optional<std::string> remoteName;
     const TelephonyServiceConnection::Status status = connection->createLogChannel(receiveName, &remoteName);
+    if (const pid_t service = connection->servicePid(); service != 0) {
+        // Only the service may feed the receive port: another process could end the channel by hanging up.
+        _recvPort->acceptOnlyFrom(service);
+    }
     connection.reset();  // used for this one request only
     if (status.error != 0) {
         SystemLog::log(kLogError, "_KxServerConnectionNetworkMonitorCreateLogChannel returns error: %ld!",

@@ -712,6 +712,15 @@ std::int32_t MessagePort::sendRequest(std::int32_t messageId, ByteView data, dou
     }
 }
 
+std::optional<MessagePort::Peer> MessagePort::listener() const {
+    ucred credentials{};
+    socklen_t length = sizeof credentials;
+    if (local_ || fd_ < 0 || getsockopt(fd_, SOL_SOCKET, SO_PEERCRED, &credentials, &length) != 0) {
+        return std::nullopt;
+    }
+    return Peer{credentials.pid, credentials.uid};
+}
+
 bool MessagePort::isValid() {
     if (!valid_) {
         return false;

@@ -112,6 +112,8 @@ class MessagePort : public std::enable_shared_from_this<MessagePort> {
     std::size_t connectionCount() const { return connections_.size(); }
     // The sender of the message being handled; only inside the message callback of a local port.
     const Peer* messageSender() const { return sender_; }
+    // A remote port's listener (its process when it began listening); nullopt when unknown.
+    std::optional<Peer> listener() const;
 
   private:
     struct Connection {

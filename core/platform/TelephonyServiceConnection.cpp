@@ -66,4 +66,9 @@ TelephonyServiceConnection::Status TelephonyServiceConnection::createLogChannel(
     return status;
 }
 
+pid_t TelephonyServiceConnection::servicePid() const {
+    const std::optional<MessagePort::Peer> service = control_->listener();
+    return service ? service->pid : 0;
+}
+
 }  // namespace velmar

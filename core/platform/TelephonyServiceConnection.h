@@ -31,8 +31,10 @@ public:
     static std::unique_ptr<TelephonyServiceConnection> create(NotificationCallback callback, MainQueue& queue);
 
     Status createLogChannel(const std::string& receivePortName, std::optional<std::string>* remotePortName);
+    // The service's process, so that the receive port can take its connections only; 0 when unknown.
+    pid_t servicePid() const;
 
-private:
+  private:
     explicit TelephonyServiceConnection(std::shared_ptr<MessagePort> control) : control_(std::move(control)) {}
     std::shared_ptr<MessagePort> control_;
 };

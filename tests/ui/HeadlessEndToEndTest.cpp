@@ -269,6 +269,32 @@ TEST_F(HeadlessEndToEndTest, TheReceivePortOfAKilledMonitorIsClearedByTheNext) {
     EXPECT_FALSE(fileExists(leftBehind));
 }
 
+TEST_F(HeadlessEndToEndTest, AnotherProcessCannotEndTheMonitorsChannelThroughItsReceivePort) {
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    auto monitor = startMonitor(outputs_.path());
+    ASSERT_TRUE(monitor->waitForOutput([](const std::string& out) { return connectedLines(out) >= 1; }, 30));
+    // A stranger of the same user connects to the monitor's receive port, sends a blob and hangs up.
+    const std::string receivePort = receivePortFileOf(runtime_.path(), monitor->pid());
+    const pid_t stranger = fork();
+    if (stranger == 0) {
+        testing::RawPeer peer(receivePort);
+        peer.send(0, 0, std::string(20, '\x01'));
+        _exit(peer.connected() ? 0 : 3);
+    }
+    int status = 0;
+    ASSERT_EQ(waitpid(stranger, &status, 0), stranger);
+    EXPECT_TRUE(monitor->waitForError("Refused a connection from pid " + std::to_string(stranger) +
+                                          " on port " + receivePort.substr(runtime_.path().size() + 1) +
+                                          ", which serves pid ",
+                                      10))
+        << monitor->errorOutput();
+    const std::size_t before = connectedLines(monitor->standardOutput());
+    EXPECT_TRUE(monitor->waitForOutput(
+        [&](const std::string& out) { return connectedLines(out) >= before + 1; }, 10));
+    EXPECT_EQ(monitor->errorOutput().find("INVALIDATED"), std::string::npos) << monitor->errorOutput();
+}
+
 TEST_F(HeadlessEndToEndTest, ANeverReadingClientDoesNotStopTheMonitorsRedraws) {
     testing::KxServerProcess service(runtime_.path(), "lte", {"--rate-multiplier", "4", "--log-stderr"});
     ASSERT_TRUE(service.start()) << service.description();
