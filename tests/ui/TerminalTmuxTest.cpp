@@ -13,7 +13,6 @@
 #include <thread>
 
 #include "core/platform/plist/PlistCodec.h"
-#include "tests/support/Json.h"
 #include "tests/support/Process.h"
 #include "tests/support/TestPaths.h"
 #include "tests/ui/ChangingValues.h"
@@ -187,21 +186,6 @@ class TerminalTmuxTest : public ::testing::Test {
         }
         return true;
     }
-    // The busiest pane of the live service, found through the headless monitor.
-    std::string busiestPane() {
-        const auto result = testing::runProcess(
-            {"/usr/bin/timeout", "-s", "TERM", "14", VELMAR_PATH, "--headless"}, "", environment());
-        std::vector<testing::LeafValues> snapshots;
-        for (const std::string& line : splitLines(result.out)) {
-            const auto json = testing::parseJson(line);
-            if (json && json->dictionary() &&
-                json->dictionary()->get("connected") == PlistValue::boolean(true)) {
-                snapshots.push_back(testing::leavesOfJson(json->dictionary()->get("tree")));
-            }
-        }
-        return testing::busiestPane(snapshots);
-    }
-
     testing::TemporaryDirectory runtime_;
     testing::TemporaryDirectory config_;
     testing::TemporaryDirectory state_;
@@ -212,8 +196,7 @@ TEST_F(TerminalTmuxTest, ConnectsShowsChangingValuesSurvivesTheServiceDyingAndRe
     testing::KxServerProcess service(runtime_.path());
     ASSERT_TRUE(service.start()) << service.description();
     std::cout << "service: " << service.description() << std::endl;
-    const std::string pane = busiestPane();
-    ASSERT_FALSE(pane.empty()) << "no value changed on the live service";
+    const std::string pane = testing::livelyPaneOf("lte");
 
     TmuxSession session;
     const auto started = std::chrono::steady_clock::now();
