@@ -22,7 +22,7 @@
 #include <vector>
 
 #include "core/platform/plist/PlistValue.h"
-#include "logfile/LogReadError.h"
+#include "logfile/LogReadResult.h"
 #include "service/BasebandSource.h"
 #include "service/ReplayPacer.h"
 
