@@ -266,10 +266,11 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
                     "connections to the control port at once (default 64, at most 4096); more are closed and "
                     "logged",
                     options.maxConnections, ServiceOptionBounds::kMaxConnections),
-        countOption("--queue-memory", "MIB",
-                    "memory for the blobs that slow clients have not taken yet, all channels together (default "
-                    "64, at most 4096); past it the client furthest behind loses its oldest blobs",
-                    options.queueMebibytes, ServiceOptionBounds::kMaxQueueMebibytes),
+        countOption(
+            "--queue-memory", "MIB",
+            "memory for the blobs that slow clients have not taken yet, all channels together (default "
+            "64, at most 4096); past it the client furthest behind loses its oldest blobs",
+            options.queueMebibytes, ServiceOptionBounds::kMaxQueueMebibytes),
         {.name = "--subscription",
          .value = "N",
          .help = "live: on a multi-SIM modem, the subscription (SIM) whose log packets stream (default: the "

@@ -146,10 +146,11 @@ TEST(ServiceOptions, TheSimulatedBasebandIsTheDefaultSource) {
 
 TEST_F(ServiceArgumentsTest, TheHelpNamesTheSimulatorsOptions) {
     const std::vector<std::string> lines = linesOf(runService({"--help"}).out);
-    ASSERT_GE(lines.size(), 4U);
+    ASSERT_GE(lines.size(), 5U);
     EXPECT_EQ(lines[2],
-              "                 [--scenario drive|walk|static] [--rate-multiplier X] [--subscription N]");
-    EXPECT_EQ(lines[3], "                 [--record FILE] | --list-devices");
+              "                 [--scenario drive|walk|static] [--rate-multiplier X] [--max-channels N]");
+    EXPECT_EQ(lines[3], "                 [--max-connections N] [--queue-memory MIB] [--subscription N]");
+    EXPECT_EQ(lines[4], "                 [--record FILE] | --list-devices");
 }
 
 TEST_F(ServiceArgumentsTest, ASecondInstanceFindsThePortHeldAndExitsOne) {
