@@ -96,8 +96,8 @@ int runKxServerd(int argc, char** argv) {
     KxServer server(queue, options.technology, options.objectBased, limits);
     // Every source's blobs enter the channels through the version adapter.
     VersionAdaptingSink adaptingSink(server);
-    std::string failure;
-    switch (server.open(&failure)) {
+    std::string listenFailure;
+    switch (server.open(&listenFailure)) {
         case KxServer::OpenResult::Serving:
             break;
         case KxServer::OpenResult::AlreadyRunning:
@@ -107,7 +107,7 @@ int runKxServerd(int argc, char** argv) {
         case KxServer::OpenResult::Failed:
             close(signals);
             return cannotStart("cannot listen on port " + std::string(kKxServerControlPortName) + ": " +
-                               failure);
+                               listenFailure);
     }
     if (!source->prepare(error)) {
         server.shutdown();

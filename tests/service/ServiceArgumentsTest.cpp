@@ -149,8 +149,10 @@ TEST_F(ServiceArgumentsTest, TheHelpNamesTheSimulatorsOptions) {
     ASSERT_GE(lines.size(), 5U);
     EXPECT_EQ(lines[2],
               "                 [--scenario drive|walk|static] [--rate-multiplier X] [--max-channels N]");
-    EXPECT_EQ(lines[3], "                 [--max-connections N] [--queue-memory MIB] [--subscription N]");
-    EXPECT_EQ(lines[4], "                 [--record FILE] | --list-devices");
+    EXPECT_EQ(
+        lines[3],
+        "                 [--max-connections N] [--queue-memory MIB] [--subscription N] [--record FILE]");
+    EXPECT_EQ(lines[4], "                 | --list-devices");
 }
 
 TEST_F(ServiceArgumentsTest, ASecondInstanceFindsThePortHeldAndExitsOne) {

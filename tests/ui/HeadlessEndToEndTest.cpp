@@ -29,9 +29,9 @@
 #include "tests/support/Json.h"
 #include "tests/support/KxTestClient.h"
 #include "tests/support/LiveModem.h"
-#include "tests/support/ServiceProcess.h"
 #include "tests/support/ProcessStats.h"
 #include "tests/support/RawPeer.h"
+#include "tests/support/ServiceProcess.h"
 #include "tests/support/TestPaths.h"
 #include "tests/ui/ChangingValues.h"
 #include "tests/ui/KxServerProcess.h"
@@ -179,7 +179,7 @@ TEST_F(HeadlessEndToEndTest, FourMonitorsShareOneService) {
     }
     for (const auto& monitor : monitors) {
         EXPECT_EQ(monitor->errorOutput().find("Local messsage port already exists"), std::string::npos);
-        EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** Created ports (send="), 1u)
+        EXPECT_EQ(testing::occurrences(monitor->errorOutput(), " ***** Created ports (send="), 1u)
             << monitor->errorOutput();
         // Each under its own name.
         EXPECT_TRUE(fileExists(receivePortFileOf(runtime_.path(), monitor->pid())));
@@ -562,7 +562,7 @@ TEST_P(HeadlessTechnologyTest, TheSimulatedBasebandShowsALivingTreeAgainAfterThe
         << monitor->errorOutput();
     std::printf("%s: values changed again %.1f s after the service restarted\n", GetParam(),
                 std::chrono::duration<double>(std::chrono::steady_clock::now() - restarted).count());
-    EXPECT_EQ(occurrences(monitor->errorOutput(), " ***** Created ports (send="), 2u)
+    EXPECT_EQ(testing::occurrences(monitor->errorOutput(), " ***** Created ports (send="), 2u)
         << monitor->errorOutput();
 }
 
