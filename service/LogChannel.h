@@ -59,8 +59,8 @@ class LogChannel : public std::enable_shared_from_this<LogChannel>, private Queu
         std::string channelPortName;
         std::string receivePortName;
         std::string_view technology;
-        bool objectBased = false;  // the technology's start command names no codes: stream every blob
-        pid_t clientPid = 0;       // the only process that may connect to the channel port; 0: any
+        bool objectBased = false;       // the technology's start command names no codes: stream every blob
+        pid_t clientPid = 0;            // the only process that may connect to the channel port; 0: any
         QueueBudget* budget = nullptr;  // shared by the service's channels; outlives them
     };
 
@@ -116,6 +116,7 @@ class LogChannel : public std::enable_shared_from_this<LogChannel>, private Queu
     // Tells the listener when a channel that is behind stops making progress (its client stalled).
     void watchForStall();
     std::size_t queuedBytes() const override { return queued_.bytes(); }
+    bool clientStalled() const override { return stalled(std::chrono::steady_clock::now()); }
     bool shedOldest() override;
     void noteDrops(std::size_t count);
     void reportDrops();

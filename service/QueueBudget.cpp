@@ -17,9 +17,16 @@ void QueueBudget::leave(Member& member) {
 void QueueBudget::enforce() {
     while (used_ > limit_) {
         Member* furthestBehind = nullptr;
+        bool furthestStalled = false;
         for (Member* member : members_) {
-            if (furthestBehind == nullptr || member->queuedBytes() > furthestBehind->queuedBytes()) {
+            if (member->queuedBytes() == 0) {
+                continue;
+            }
+            const bool stalled = member->clientStalled();
+            if (furthestBehind == nullptr || (stalled && !furthestStalled) ||
+                (stalled == furthestStalled && member->queuedBytes() > furthestBehind->queuedBytes())) {
                 furthestBehind = member;
+                furthestStalled = stalled;
             }
         }
         if (furthestBehind == nullptr || !furthestBehind->shedOldest()) {

@@ -2,9 +2,11 @@
 // that stop reading cannot make the service grow however many of them there are.
 //
 // Contract: queues count their bytes in (add) and out (remove). enforce(), called after a queue grew, makes
-// the member furthest behind (the one holding the most bytes) shed its oldest blobs until the total is within
-// the limit again; the member counts and reports its own losses. Members join while they exist and leave
-// before they go.
+// the member furthest behind shed its oldest blobs until the total is within the limit again: of the members
+// whose clients have stopped reading, the one holding the most bytes; when no such member holds any, the one
+// holding the most bytes of all. A client that reads, even one a little behind, thus loses nothing while
+// stalled clients hold blobs. The member counts and reports its own losses. Members join while they exist
+// and leave before they go.
 #pragma once
 
 #include <cstddef>
@@ -18,6 +20,8 @@ class QueueBudget {
       public:
         virtual ~Member() = default;
         virtual std::size_t queuedBytes() const = 0;
+        // Whether the member's client has stopped taking what is queued for it.
+        virtual bool clientStalled() const = 0;
         // Drops the member's oldest queued blob; false when it holds none.
         virtual bool shedOldest() = 0;
     };
