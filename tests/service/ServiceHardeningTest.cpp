@@ -4,6 +4,8 @@
 // cannot start. Real processes throughout; the CPU and memory figures come from /proc.
 #include <gtest/gtest.h>
 
+#include <cstring>
+
 #include <signal.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
@@ -126,6 +128,11 @@ TEST_F(HardeningTest, AClientThatNeverReadsItsRepliesIsDroppedWhileOthersAreAnsw
 }
 
 TEST_F(HardeningTest, OutOfDescriptorsTheServiceRefusesWithTheReasonWaitsInsteadOfSpinningAndRecovers) {
+#ifdef VELMAR_UNDER_ASAN
+    // The sanitizers' runtime checks memory through a pipe of its own: in a process without a free descriptor
+    // those checks fail and end it. The default build runs this test.
+    GTEST_SKIP() << "the sanitizer runtime needs free descriptors of its own";
+#endif
     BackgroundProcess service(
         "/bin/sh",
         {"-c", "ulimit -n 32 && exec \"$0\" \"$@\"", KXSERVERD_PATH, "--source", "sim", "--log-stderr"},
@@ -137,7 +144,8 @@ TEST_F(HardeningTest, OutOfDescriptorsTheServiceRefusesWithTheReasonWaitsInstead
     std::string refusal;
     for (int attempt = 0; attempt < 40 && refusal.empty(); ++attempt) {
         RawPeer peer(controlPath());
-        ASSERT_TRUE(peer.connected());
+        ASSERT_TRUE(peer.connected()) << "attempt " << attempt << ": " << std::strerror(errno) << "\n"
+                                      << service.errorOutput();
         ASSERT_TRUE(peer.send(0, RawPeer::kReplyWanted, encoded(createLogChannel("com.velmar.test.sink"))));
         std::optional<std::string> reply;
         for (const auto asked = Clock::now(); !reply && secondsSince(asked) < 10;) {
