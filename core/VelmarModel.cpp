@@ -1,5 +1,6 @@
 #include "core/VelmarModel.h"
 
+#include "core/platform/Clock.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 
@@ -127,6 +128,7 @@ VelmarModelNodeRef VelmarModel::topLevelNodes() {
     auto paths = std::make_unique<NodePathDictionary>();
     _nodes = VelmarModelNode::makeTreeFromObject(display, *paths);
     _nodesByPath = std::move(paths);
+    history_.sample(*_nodesByPath, Clock::now());
     return _nodes;
 }
 

@@ -8,6 +8,8 @@
 // tick that finds it updated drops the display tree and asks the delegate to redraw, asynchronously on the
 // main queue; the tree is rebuilt lazily, at most once per acting tick, by the first topLevelNodes or
 // nodeAtPath. The state, the generator and the tree survive a restart. All of it runs on one main queue.
+// Each build of the tree (once per redraw) samples its numeric leaves into the value history, which survives
+// restarts and is cleared when the service answers another technology than before.
 #pragma once
 
 #include <memory>
@@ -15,6 +17,7 @@
 #include <string>
 
 #include "core/MonitorGenerator.h"
+#include "core/ValueHistory.h"
 #include "core/VelmarModelNode.h"
 #include "core/platform/MainQueue.h"
 #include "core/platform/MessagePort.h"
@@ -59,6 +62,7 @@ public:
     MonitorGenerator* generator() const { return _logGenerator.get(); }
     const PlistDictionaryRef& state() const { return _state; }
     void setReceivePortName(std::string name) { receivePortName_ = std::move(name); }
+    const ValueHistory& history() const { return history_; }
 
 private:
     std::optional<PlistData> onLogChannelMessage(std::int32_t messageId, ByteView data);
@@ -80,6 +84,8 @@ private:
     VelmarModelDelegate* delegate_;
     MainQueue::Handle retryTimer_ = 0;
     std::string receivePortName_ = kReceivePortName;
+    ValueHistory history_;
+    std::string historyTechnology_;
     // Cleared when the model goes, so that redraw requests still queued do nothing.
     std::shared_ptr<bool> alive_ = std::make_shared<bool>(true);
 };
