@@ -11,6 +11,8 @@ namespace {
 // The units that follow a number after one blank in the decoders' formats.
 constexpr std::array<std::string_view, 5> kSpacedUnits = {"dBm", "dB", "kbps", "sec", "\xC3\x97 64chips"};
 constexpr std::string_view kPercent = "%";
+// More significant digits than a double holds exactly: an identity, not a quantity.
+constexpr std::size_t kMostIntegerDigits = 15;
 
 bool isBlank(char c) {
     return c == ' ' || c == '\t';
@@ -70,15 +72,19 @@ std::optional<std::string_view> knownUnit(std::string_view rest) {
 std::optional<NumericValue> parseNumericValue(std::string_view text) {
     text = withoutRemarks(trim(text));
     bool negative = false;
+    bool plus = false;
     if (!text.empty() && (text.front() == '+' || text.front() == '-')) {
         negative = text.front() == '-';
+        plus = !negative;
         text.remove_prefix(1);
     }
     std::size_t end = 0;
+    std::size_t leadingZeros = 0;
     while (end < text.size() && isDigit(text[end])) {
+        leadingZeros += leadingZeros == end && text[end] == '0';
         ++end;
     }
-    if (end == 0) {
+    if (end == 0 || end - leadingZeros > kMostIntegerDigits) {
         return std::nullopt;
     }
     if (end < text.size() && text[end] == '.') {
@@ -92,7 +98,7 @@ std::optional<NumericValue> parseNumericValue(std::string_view text) {
         end = fraction;
     }
     const std::optional<std::string_view> unit = knownUnit(text.substr(end));
-    if (!unit) {
+    if (!unit || (plus && unit->empty())) {
         return std::nullopt;
     }
     double magnitude = 0.0;

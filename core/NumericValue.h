@@ -8,8 +8,10 @@
 // else is not a number: texts such as "Not Present", "N/A", "Unknown", bracketed raw values ("[Reserved 3]"),
 // hexadecimal identities ("0x0a1b2c"), addresses, and the names of value tables even where they begin with
 // digits ("10 MHz", "500 ms", "1 to 3", "800 MHz cellular band [0]"), whose units no printf format of ours
-// prints. Numbers a double cannot hold (out of range) are not numbers either. The unit returned refers to
-// static storage, never to the text parsed.
+// prints. Digit strings that are identities rather than quantities are not numbers either: more than 15
+// significant digits before the point (a SIM's ICCID; a double would not even hold them exactly), and a "+"
+// without a unit (a subscriber number: our "%+" formats all print a unit). The unit returned refers to static
+// storage, never to the text parsed.
 #pragma once
 
 #include <optional>

@@ -25,6 +25,7 @@ TEST(NumericValueTest, IntegerFormats) {
     expectNumber(stringWithFormat("%d", 0), 0, "");
     expectNumber(stringWithFormat("%u", 4000000000u), 4000000000.0, "");
     expectNumber(stringWithFormat("%ld", 1263206400L), 1263206400, "");
+    expectNumber(stringWithFormat("%d", 999999999), 999999999, "");
     expectNumber(stringWithFormat("%d dBm", -85), -85, "dBm");
     expectNumber(stringWithFormat("%d dBm", 60), 60, "dBm");
     expectNumber(stringWithFormat("%d dB", -159), -159, "dB");
@@ -32,8 +33,6 @@ TEST(NumericValueTest, IntegerFormats) {
     expectNumber(stringWithFormat("%+d dBm", -12), -12, "dBm");
     expectNumber(stringWithFormat("%d sec", 4), 4, "sec");
     expectNumber(stringWithFormat("%d \xC3\x97 64chips", 168), 168, "\xC3\x97 64chips");
-    // A subscriber number shown with its international prefix reads as a number too.
-    expectNumber("+15550100", 15550100, "");
 }
 
 TEST(NumericValueTest, FixedPointFormats) {
@@ -54,8 +53,8 @@ TEST(NumericValueTest, FixedPointFormats) {
     const auto zero = parseNumericValue(stringWithFormat("%4.2f dB", -0.0));
     ASSERT_TRUE(zero);
     EXPECT_FALSE(std::signbit(zero->value));
-    // %f of a huge double is a long run of digits, still a number.
-    expectNumber(stringWithFormat("%f", 1e300), 1e300, "");
+    expectNumber(stringWithFormat("%f", 123456789012345.0), 123456789012345.0, "");
+    expectNumber("000000000000000012.5", 12.5, "");  // leading zeros are not significant
 }
 
 TEST(NumericValueTest, RemarksInParenthesesAreLeftOut) {
@@ -125,9 +124,15 @@ TEST(NumericValueTest, ValueTableNamesThatBeginWithDigitsAreNotNumbers) {
     }
 }
 
-TEST(NumericValueTest, NumbersBeyondADoubleAreNotNumbers) {
-    EXPECT_FALSE(parseNumericValue("1" + std::string(400, '0')));
+TEST(NumericValueTest, IdentitiesMadeOfDigitsAreNotNumbers) {
+    // A SIM's ICCID, and anything longer than a double holds exactly.
+    EXPECT_FALSE(parseNumericValue("89001012012345678905"));
+    EXPECT_FALSE(parseNumericValue("1234567890123456"));
+    EXPECT_FALSE(parseNumericValue(stringWithFormat("%f", 1e300)));
     EXPECT_FALSE(parseNumericValue("-1" + std::string(400, '0') + " dBm"));
+    // A subscriber number with its international prefix: a "+" comes with a unit in our formats.
+    EXPECT_FALSE(parseNumericValue("+15555550123"));
+    EXPECT_FALSE(parseNumericValue("+5"));
 }
 
 }  // namespace
