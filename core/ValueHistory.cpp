@@ -13,6 +13,11 @@ double newestTimeOf(const ValueSeries& series) {
 }
 }  // namespace
 
+bool isNumericLeaf(const VelmarModelNode* node) {
+    const std::string* value = node != nullptr && node->childNodes() == nullptr ? node->value() : nullptr;
+    return value != nullptr && parseNumericValue(*value).has_value();
+}
+
 std::size_t ValueSeries::firstIndexAtOrAfter(double time) const {
     std::size_t low = 0;
     std::size_t high = count_;

@@ -52,6 +52,9 @@ class ValueSeries {
     std::uint64_t seenTick_ = 0;
 };
 
+// Whether a node is a leaf whose value reads as a number: what the history samples and the charts draw.
+bool isNumericLeaf(const VelmarModelNode* node);
+
 class ValueHistory {
   public:
     struct Limits {

@@ -1,8 +1,9 @@
 #include "ui/qt/VelmarPaneController.h"
 
 #include <QVBoxLayout>
+#include <algorithm>
 
-#include "core/NumericValue.h"
+#include "core/ValueHistory.h"
 #include "ui/qt/NavigationController.h"
 #include "ui/qt/VelmarChartController.h"
 #include "ui/qt/VelmarApp.h"
@@ -66,13 +67,8 @@ bool VelmarPaneController::hasNumericLeaves() const {
     if (children == nullptr) {
         return false;
     }
-    for (const VelmarModelNodeRef& child : *children) {
-        const std::string* value = child->childNodes() == nullptr ? child->value() : nullptr;
-        if (value != nullptr && parseNumericValue(*value)) {
-            return true;
-        }
-    }
-    return false;
+    return std::any_of(children->begin(), children->end(),
+                       [](const VelmarModelNodeRef& child) { return isNumericLeaf(child.get()); });
 }
 
 const VelmarModelNodeRef* VelmarPaneController::childAt(int row) const {
@@ -138,9 +134,7 @@ void VelmarPaneController::didSelectRow(TableView& table, int row) {
 
 void VelmarPaneController::didLongPressRow(TableView&, int row) {
     const VelmarModelNodeRef* child = childAt(row);
-    const std::string* value =
-        child != nullptr && (*child)->childNodes() == nullptr ? (*child)->value() : nullptr;
-    if (value == nullptr || !parseNumericValue(*value)) {
+    if (child == nullptr || !isNumericLeaf(child->get())) {
         return;  // only a number has a chart
     }
     pushChart(ChartKind::Value, *child,
