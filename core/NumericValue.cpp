@@ -87,6 +87,7 @@ std::optional<NumericValue> parseNumericValue(std::string_view text) {
     if (end == 0 || end - leadingZeros > kMostIntegerDigits) {
         return std::nullopt;
     }
+    int decimals = 0;
     if (end < text.size() && text[end] == '.') {
         std::size_t fraction = end + 1;
         while (fraction < text.size() && isDigit(text[fraction])) {
@@ -95,6 +96,7 @@ std::optional<NumericValue> parseNumericValue(std::string_view text) {
         if (fraction == end + 1) {
             return std::nullopt;  // "12." is not a format of ours
         }
+        decimals = static_cast<int>(fraction - end - 1);
         end = fraction;
     }
     const std::optional<std::string_view> unit = knownUnit(text.substr(end));
@@ -107,7 +109,7 @@ std::optional<NumericValue> parseNumericValue(std::string_view text) {
         return std::nullopt;
     }
     // Adding 0.0 turns a negative zero ("-0.00 dB") into zero.
-    return NumericValue{(negative ? -magnitude : magnitude) + 0.0, *unit};
+    return NumericValue{(negative ? -magnitude : magnitude) + 0.0, *unit, decimals};
 }
 
 }  // namespace velmar

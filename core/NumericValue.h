@@ -23,6 +23,9 @@ struct NumericValue {
     double value = 0.0;
     // "" for a plain number.
     std::string_view unit;
+    // Digits after the point as printed ("-99.75 dBm": 2, "12": 0), to print other values of the same leaf
+    // alike.
+    int decimals = 0;
 };
 
 std::optional<NumericValue> parseNumericValue(std::string_view text);

@@ -139,6 +139,7 @@ void ValueHistory::append(const Reading& reading, double time) {
         }
     }
     series->unit_ = reading.unit;
+    series->decimals_ = reading.decimals;
     const ValueSample sample{time, reading.value};
     if (series->count_ == series->ring_.size() && !grow(*series)) {
         // Full and not allowed to grow: the oldest sample makes way.
@@ -179,7 +180,7 @@ void ValueHistory::sample(const NodePathDictionary& nodes, double time) {
             series->seenTick_ = tick_;
             ++currentSeries_;
         }
-        readings_.push_back({&path, series, number->value, number->unit});
+        readings_.push_back({&path, series, number->value, number->unit, number->decimals});
     }
     for (const Reading& reading : readings_) {
         append(reading, time);

@@ -33,6 +33,8 @@ class ValueSeries {
   public:
     // "" for plain numbers; the unit of the newest sample.
     std::string_view unit() const { return unit_; }
+    // The digits after the point of the newest sample as the display printed it.
+    int decimals() const { return decimals_; }
     std::size_t size() const { return count_; }
     bool empty() const { return count_ == 0; }
     // Oldest first: at(0) is the oldest sample kept, at(size() - 1) the newest.
@@ -49,6 +51,7 @@ class ValueSeries {
     std::size_t start_ = 0;
     std::size_t count_ = 0;
     std::string_view unit_;
+    int decimals_ = 0;
     std::uint64_t seenTick_ = 0;
 };
 
@@ -93,6 +96,7 @@ class ValueHistory {
         ValueSeries* series;  // null for a path without a series yet
         double value;
         std::string_view unit;
+        int decimals;
     };
 
     void forgetStaleSeries(double time);

@@ -1,21 +1,16 @@
 #include "ui/ChartText.h"
 
+#include <algorithm>
 #include <cmath>
 
 #include "core/platform/StringFormat.h"
 
 namespace velmar {
 
-std::string formatChartNumber(double value, std::string_view unit) {
-    std::string text = stringWithFormat("%.2f", value);
-    while (text.back() == '0') {
-        text.pop_back();
-    }
-    if (text.back() == '.') {
-        text.pop_back();
-    }
-    if (text == "-0") {
-        text = "0";
+std::string formatReading(double value, int decimals, std::string_view unit) {
+    std::string text = stringWithFormat("%.*f", std::clamp(decimals, 0, 9), value);
+    if (text.front() == '-' && text.find_first_not_of("-0.") == std::string::npos) {
+        text.erase(0, 1);  // "-0.00": a value that rounds to zero has no sign
     }
     if (unit.empty()) {
         return text;

@@ -1,9 +1,9 @@
 // ChartText: the texts that both front ends' charts show beside their lines, so that they read alike.
 //
-// Contract: formatChartNumber writes a value with at most two decimals and no trailing zeros ("-101.25",
-// "60", "3.5", "0"); with a unit it follows after a blank, except "%" which follows at once. formatSpan
-// names a time span in whole minutes from one minute on ("10 min", "60 min") and in seconds below it
-// ("45 s").
+// Contract: formatReading prints a value of a leaf as its pane prints the leaf's values: exactly the given
+// number of decimals (0 to 9), then the unit after a blank, except "%" which follows at once ("-65.50 dBm",
+// "12", "3.1%"); a value that rounds to zero prints without a minus sign. formatSpan names a time span in
+// whole minutes from one minute on ("10 min", "60 min") and in seconds below it ("45 s").
 #pragma once
 
 #include <string>
@@ -11,7 +11,7 @@
 
 namespace velmar {
 
-std::string formatChartNumber(double value, std::string_view unit = {});
+std::string formatReading(double value, int decimals, std::string_view unit);
 std::string formatSpan(double seconds);
 
 }  // namespace velmar

@@ -57,6 +57,14 @@ TEST(NumericValueTest, FixedPointFormats) {
     expectNumber("000000000000000012.5", 12.5, "");  // leading zeros are not significant
 }
 
+TEST(NumericValueTest, DecimalsAsPrinted) {
+    EXPECT_EQ(parseNumericValue(stringWithFormat("%4.2f dBm", -65.5)).value().decimals, 2);
+    EXPECT_EQ(parseNumericValue(stringWithFormat("%d dBm", -85)).value().decimals, 0);
+    EXPECT_EQ(parseNumericValue(stringWithFormat("%f", 0.5)).value().decimals, 6);
+    EXPECT_EQ(parseNumericValue(stringWithFormat("%.02f%%", 3.1)).value().decimals, 2);
+    EXPECT_EQ(parseNumericValue("(ref pilot) +10.0 dB").value().decimals, 1);
+}
+
 TEST(NumericValueTest, RemarksInParenthesesAreLeftOut) {
     expectNumber(stringWithFormat("%.02f%% (old)", 1.56), 1.56, "%");
     expectNumber(stringWithFormat("(ref pilot) %+.2f dB", 10.0), 10.0, "dB");

@@ -56,10 +56,12 @@ TEST(ValueHistoryTest, SamplesEveryNumericLeafWithItsUnitUnderItsPath) {
     ASSERT_TRUE(rsrp);
     ASSERT_EQ(rsrp->size(), 1u);
     EXPECT_EQ(rsrp->unit(), "dBm");
+    EXPECT_EQ(rsrp->decimals(), 2);
     EXPECT_EQ(rsrp->newest().time, 1000.0);
     EXPECT_EQ(rsrp->newest().value, -99.75);
     ASSERT_TRUE(history.series("/Cell/PCI"));
     EXPECT_EQ(history.series("/Cell/PCI")->unit(), "");
+    EXPECT_EQ(history.series("/Cell/PCI")->decimals(), 0);
     EXPECT_EQ(history.series("/Cell/RSRQ")->newest().value, -10.88);
     EXPECT_EQ(history.series("/Cell/State"), nullptr);
     EXPECT_EQ(history.series("/Cell/Band"), nullptr);

@@ -106,15 +106,20 @@ TEST(ChartScaleTest, HostileSpansGiveFewTicksAndNoLoop) {
     EXPECT_EQ(nan.ticks, 2);
 }
 
-TEST(ChartTextTest, NumbersWithAtMostTwoDecimalsAndTheirUnit) {
-    EXPECT_EQ(formatChartNumber(-101.25), "-101.25");
-    EXPECT_EQ(formatChartNumber(60.0), "60");
-    EXPECT_EQ(formatChartNumber(3.5), "3.5");
-    EXPECT_EQ(formatChartNumber(-0.001), "0");
-    EXPECT_EQ(formatChartNumber(-99.75, "dBm"), "-99.75 dBm");
-    EXPECT_EQ(formatChartNumber(3.1, "%"), "3.1%");
-    EXPECT_EQ(formatChartNumber(168, "\xC3\x97 64chips"), "168 \xC3\x97 64chips");
-    EXPECT_EQ(formatChartNumber(1263206400.0), "1263206400");
+TEST(ChartTextTest, ReadingsWithTheDecimalsOfTheDisplayAndTheirUnit) {
+    EXPECT_EQ(formatReading(-101.25, 2, ""), "-101.25");
+    EXPECT_EQ(formatReading(-65.5, 2, "dBm"), "-65.50 dBm");
+    EXPECT_EQ(formatReading(60.0, 0, ""), "60");
+    EXPECT_EQ(formatReading(-10.875, 2, "dB"), "-10.88 dB");
+    EXPECT_EQ(formatReading(3.1, 2, "%"), "3.10%");
+    EXPECT_EQ(formatReading(-0.001, 2, "dB"), "0.00 dB");
+    EXPECT_EQ(formatReading(-0.4, 0, ""), "0");
+    EXPECT_EQ(formatReading(-0.5, 1, ""), "-0.5");
+    EXPECT_EQ(formatReading(168, 0, "\xC3\x97 64chips"), "168 \xC3\x97 64chips");
+    EXPECT_EQ(formatReading(1263206400.0, 0, "sec"), "1263206400 sec");
+    // Out-of-range decimals are held to what a double can show.
+    EXPECT_EQ(formatReading(1.5, -3, ""), "2");
+    EXPECT_EQ(formatReading(0.25, 40, ""), "0.250000000");
 }
 
 TEST(ChartTextTest, Spans) {

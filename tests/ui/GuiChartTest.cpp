@@ -13,6 +13,7 @@
 #include <QApplication>
 #include <QGestureEvent>
 #include <QPinchGesture>
+#include <QRegularExpression>
 #include <QTest>
 #include <cmath>
 #include <cstdlib>
@@ -199,6 +200,10 @@ TEST_F(GuiChartTest, PaneChartAndValueChartOfLiveValues) {
             EXPECT_GE(axis->max(), range->second);
         }
     }
+    // In the phone-sized window every name stands whole, in one column if need be.
+    for (int i = 0; i < legend->entryCount(); ++i) {
+        EXPECT_GE(legend->entry(i)->width(), legend->widestEntryWidth()) << i;
+    }
     save("gui-chart-pane.png");
 
     // A tap on a legend entry hides its line, and another shows it again; a hidden plain number shows too.
@@ -251,6 +256,11 @@ TEST_F(GuiChartTest, PaneChartAndValueChartOfLiveValues) {
     // At home on a large screen too.
     app_->window()->resize(1280, 800);
     QApplication::processEvents();
+    // No more columns than entries, and every name whole.
+    EXPECT_LE(legend->columns(), legend->entryCount());
+    for (int i = 0; i < legend->entryCount(); ++i) {
+        EXPECT_GE(legend->entry(i)->width(), legend->widestEntryWidth()) << i;
+    }
     save("gui-chart-pane-large.png");
     app_->window()->resize(VelmarApp::kPhoneWidth, VelmarApp::kPhoneHeight);
     QApplication::processEvents();
@@ -275,9 +285,11 @@ TEST_F(GuiChartTest, PaneChartAndValueChartOfLiveValues) {
     EXPECT_FALSE(valueChart->legend()->isVisible());
     const QString summary = valueChart->summary()->text();
     const std::string shownValue = *model().nodeAtPath(valueChart->path())->value();
-    EXPECT_TRUE(summary.startsWith(QString::fromStdString("now " + shownValue + "   min -")))
-        << summary.toStdString();
-    EXPECT_TRUE(summary.contains("   max -")) << summary.toStdString();
+    // The least and greatest printed as the pane prints levels, with two decimals.
+    const QRegularExpression summaryPattern(QRegularExpression::anchoredPattern(
+        QRegularExpression::escape(QString::fromStdString("now " + shownValue)) +
+        QStringLiteral("   min -\\d+\\.\\d\\d   max -\\d+\\.\\d\\d")));
+    EXPECT_TRUE(summaryPattern.match(summary).hasMatch()) << summary.toStdString();
     save("gui-chart-value.png");
     ASSERT_TRUE(tick());
     EXPECT_EQ(valueChart->chartView()->series(0)->count(),

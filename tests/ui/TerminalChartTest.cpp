@@ -68,7 +68,7 @@ TEST_F(TerminalChartTest, TitleSummaryAxesAndTheLineInBraille) {
     EXPECT_EQ(canvas.rowText(0), " RSRP" + spaces(64) + "-80.00 dBm ");
     EXPECT_TRUE(canvas.at(0, 1).attr & kAttrReverse);
     EXPECT_TRUE(canvas.at(0, 1).attr & kAttrBold);
-    EXPECT_EQ(canvas.rowText(1), " min -110 dBm   max -80 dBm   last 10 min" + spaces(39));
+    EXPECT_EQ(canvas.rowText(1), " min -110.00 dBm   max -80.00 dBm   last 10 min" + spaces(33));
     // Twelve plot lines (2..13), the axis in column 5, labels every 10 dB from -80 down to -110.
     const std::map<int, std::string> labelRows = {
         {2, "  -80┤"}, {6, "  -90┤"}, {9, " -100┤"}, {13, " -110┤"}};
@@ -141,8 +141,8 @@ TEST_F(TerminalChartTest, ZoomStepsAndTheSpanShown) {
     EXPECT_EQ(shown.spanSeconds(), 60.0);
     TerminalCanvas canvas(16, 60, false);
     TerminalChartView::draw(canvas, shown, history_.series("/Cell/RSRP"), history_.newestTime(), {0, false});
-    // The last minute: -86 up to -80, and its times to the second.
-    EXPECT_EQ(canvas.rowText(1), " min -86 dBm   max -80 dBm   last 1 min" + spaces(21));
+    // The last minute: -86 up to -80, printed as the pane prints them, and its times to the second.
+    EXPECT_EQ(canvas.rowText(1), " min -86.00 dBm   max -80.00 dBm   last 1 min" + spaces(15));
     EXPECT_NE(canvas.rowText(14).find("14:03:00"), std::string::npos) << canvas.rowText(14);
     shown.zoomOut(3600.0);
     shown.zoomOut(3600.0);
@@ -283,12 +283,12 @@ TEST_F(TerminalChartFrontEndTest, COnANumberOpensItsLiveChartAndEscLeftOrBackspa
     EXPECT_EQ(frontEnd.chart()->status().rfind("Updated ", 0), 0u);
     std::vector<std::string> lines = frame(frontEnd);
     EXPECT_EQ(lines[0], " RSRP" + spaces(44) + "-97.00 dBm ");
-    EXPECT_EQ(lines[1], " min -99 dBm   max -97 dBm   last 10 min" + spaces(20));
+    EXPECT_EQ(lines[1], " min -99.00 dBm   max -97.00 dBm   last 10 min" + spaces(14));
     // Live: the next redraw brings the new value and sample.
     tick(frontEnd, service);
     lines = frame(frontEnd);
     EXPECT_EQ(lines[0], " RSRP" + spaces(44) + "-96.00 dBm ");
-    EXPECT_EQ(lines[1], " min -99 dBm   max -96 dBm   last 10 min" + spaces(20));
+    EXPECT_EQ(lines[1], " min -99.00 dBm   max -96.00 dBm   last 10 min" + spaces(14));
     // + and - zoom; the pane keys do nothing here.
     frontEnd.handleKey(TerminalKey::character(U'+'));
     EXPECT_EQ(frontEnd.chart()->spanSeconds(), 300.0);

@@ -10,6 +10,12 @@ namespace {
 
 constexpr int kSwatch = 12;
 constexpr int kEntryHeight = 30;
+constexpr int kMargin = 8;
+constexpr int kGap = 6;
+constexpr int kTextLeft = kMargin + kSwatch + kGap;
+// A single column that shows every name whole is preferred to more columns that cut names, unless it makes
+// the legend more than this many rows taller.
+constexpr int kMostExtraRowsForWholeNames = 2;
 
 // One legend entry: a swatch and a text, left-aligned, cut at the end when the column is narrow.
 class LegendButton : public QAbstractButton {
@@ -29,6 +35,7 @@ class LegendButton : public QAbstractButton {
         }
         setText(entry.name);
         value_ = entry.value;
+        widestValue_ = std::max(widestValue_, fontMetrics().horizontalAdvance(value_));
         setToolTip(entry.name + QStringLiteral("  ") + entry.value);
         colour_ = entry.colour;
         shown_ = entry.shown;
@@ -36,6 +43,13 @@ class LegendButton : public QAbstractButton {
     }
     bool shown() const { return shown_; }
     QSize sizeHint() const override { return {ChartLegend::kEntryWidth, kEntryHeight}; }
+    // The width that shows the name uncut beside the widest value it has shown, so that values that change
+    // width at each redraw do not move the columns back and forth.
+    int naturalWidth() const {
+        QFont bold = font();
+        bold.setBold(true);
+        return kTextLeft + QFontMetrics(bold).horizontalAdvance(text()) + kGap + widestValue_ + kMargin;
+    }
 
   protected:
     void paintEvent(QPaintEvent*) override {
@@ -44,7 +58,7 @@ class LegendButton : public QAbstractButton {
         if (isDown()) {
             painter.fillRect(rect(), QColor(0xd9, 0xd9, 0xd9));
         }
-        const QRectF swatch(8, (height() - kSwatch) / 2.0, kSwatch, kSwatch);
+        const QRectF swatch(kMargin, (height() - kSwatch) / 2.0, kSwatch, kSwatch);
         painter.setPen(QPen(colour_, 2));
         painter.setBrush(shown_ ? QBrush(colour_) : Qt::NoBrush);
         painter.drawRoundedRect(swatch.adjusted(1, 1, -1, -1), 2, 2);
@@ -53,12 +67,12 @@ class LegendButton : public QAbstractButton {
             ink = QColor(0xa0, 0xa0, 0xa0);
         }
         painter.setPen(ink);
-        const int left = 8 + kSwatch + 6;
-        const int right = width() - 8;
+        const int left = kTextLeft;
+        const int right = width() - kMargin;
         const int valueWidth = std::min(fontMetrics().horizontalAdvance(value_), std::max(0, right - left));
         painter.drawText(QRect(right - valueWidth, 0, valueWidth, height()),
                          Qt::AlignVCenter | Qt::AlignRight, value_);
-        const int nameWidth = std::max(0, right - valueWidth - 6 - left);
+        const int nameWidth = std::max(0, right - valueWidth - kGap - left);
         QFont bold = font();
         bold.setBold(true);
         painter.setFont(bold);
@@ -68,6 +82,7 @@ class LegendButton : public QAbstractButton {
 
   private:
     QString value_;
+    int widestValue_ = 0;
     QColor colour_;
     bool shown_ = true;
 };
@@ -99,10 +114,35 @@ void ChartLegend::setEntries(const std::vector<Entry>& entries) {
     for (std::size_t i = 0; i < entries.size(); ++i) {
         static_cast<LegendButton*>(buttons_[i])->setEntry(entries[i]);
     }
+    // New names or values may fit in other columns.
+    relayout();
+}
+
+int ChartLegend::widestEntryWidth() const {
+    int widest = 0;
+    for (QAbstractButton* button : buttons_) {
+        widest = std::max(widest, static_cast<LegendButton*>(button)->naturalWidth());
+    }
+    return widest;
+}
+
+int ChartLegend::columnsForWidth(int width) const {
+    const int entries = static_cast<int>(buttons_.size());
+    const QMargins margins = grid_->contentsMargins();
+    const int inner = std::max(0, width - margins.left() - margins.right());
+    const int most = std::clamp(inner / kEntryWidth, 1, std::max(1, entries));
+    const int widest = widestEntryWidth();
+    const auto rows = [entries](int columns) { return (entries + columns - 1) / columns; };
+    for (int columns = most; columns >= 1; --columns) {
+        if (inner / columns >= widest) {
+            return rows(columns) <= rows(most) + kMostExtraRowsForWholeNames ? columns : most;
+        }
+    }
+    return most;
 }
 
 int ChartLegend::heightForWidth(int width) const {
-    const int columns = std::max(1, width / kEntryWidth);
+    const int columns = columnsForWidth(width);
     const int rows = (static_cast<int>(buttons_.size()) + columns - 1) / columns;
     const QMargins margins = grid_->contentsMargins();
     return rows * kEntryHeight + margins.top() + margins.bottom();
@@ -114,11 +154,12 @@ void ChartLegend::resizeEvent(QResizeEvent* event) {
 }
 
 void ChartLegend::relayout() {
-    const int columns = std::max(1, width() / kEntryWidth);
+    const int columns = columnsForWidth(width());
     if (columns == columns_) {
         return;
     }
     columns_ = columns;
+    updateGeometry();
     for (QAbstractButton* button : buttons_) {
         grid_->removeWidget(button);
     }

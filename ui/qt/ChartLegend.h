@@ -1,7 +1,8 @@
 // ChartLegend: the legend of a chart: one entry per line (a swatch of the line's colour, the leaf's name and
-// its value), in as many columns as the width allows, each a button that a tap or click toggles. The value
-// stands whole at the entry's right; a name too long for what is left is cut in its middle, so that names
-// that differ only at their end ("Measured RSRP", "Measured RSRQ") stay apart.
+// its value), in as many columns as the width allows (fewer where that shows every name whole at the cost of
+// a row or two), each a button that a tap or click toggles. The value stands whole at the entry's right; a
+// name too long for what is left is cut in its middle, so that names that differ only at their end
+// ("Measured RSRP", "Measured RSRQ") stay apart.
 //
 // Contract: setEntries shows the entries; the same number of entries updates the buttons in place (no
 // flicker at each redraw), another number rebuilds them. A hidden line's entry is drawn faint with a hollow
@@ -34,6 +35,8 @@ class ChartLegend : public QWidget {
     int entryCount() const { return static_cast<int>(buttons_.size()); }
     QAbstractButton* entry(int index) const { return buttons_.at(static_cast<std::size_t>(index)); }
     int columns() const { return columns_; }
+    // The width the widest entry needs to show its name whole beside the widest value it has shown.
+    int widestEntryWidth() const;
     // The height that shows every entry at a width.
     int heightForWidth(int width) const override;
     bool hasHeightForWidth() const override { return true; }
@@ -45,6 +48,8 @@ class ChartLegend : public QWidget {
     void resizeEvent(QResizeEvent* event) override;
 
   private:
+    // As many columns as the width holds (no more than entries), fewer where that shows every name whole.
+    int columnsForWidth(int width) const;
     void relayout();
 
     QGridLayout* grid_;

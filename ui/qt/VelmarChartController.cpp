@@ -108,11 +108,8 @@ void VelmarChartController::updateLegend() {
         entries.push_back({chart_->series(i)->name(), value != values_.end() ? value->second : QString(),
                            chart_->lineColour(i), chart_->isLineVisible(i)});
     }
-    const int before = legend_->entryCount();
     legend_->setEntries(entries);
-    if (legend_->entryCount() != before) {
-        resizeEvent(nullptr);
-    }
+    resizeEvent(nullptr);  // more entries or wider values may take more rows
 }
 
 void VelmarChartController::resizeEvent(QResizeEvent* event) {
@@ -131,12 +128,15 @@ void VelmarChartController::updateSummary() {
         summary_->setText(QStringLiteral("No values yet"));
         return;
     }
-    // The value now as the pane shows it; the least and greatest of the span in the same unit.
+    // The value now as the pane shows it; the least and greatest of the span printed alike, their unit once.
     const auto shown = values_.find(path_);
     QString text = QStringLiteral("now ") + (shown != values_.end() ? shown->second : QString());
+    const VelmarModel* model = application_.shell().model();
+    const ValueSeries* series = model != nullptr ? model->history().series(path_) : nullptr;
+    const int decimals = series != nullptr ? series->decimals() : 2;
     if (const auto range = chart_->visibleRange(0)) {
-        text += QString::fromStdString("   min " + formatChartNumber(range->first) + "   max " +
-                                       formatChartNumber(range->second));
+        text += QString::fromStdString("   min " + formatReading(range->first, decimals, {}) + "   max " +
+                                       formatReading(range->second, decimals, {}));
     }
     summary_->setText(text);
 }

@@ -160,10 +160,10 @@ void TerminalChartView::draw(TerminalCanvas& canvas, const TerminalChart& chart,
         low = std::min(low, point.value);
         high = std::max(high, point.value);
     }
-    canvas.put(
-        1, 1,
-        "min " + formatChartNumber(low, unit) + "   max " + formatChartNumber(high, unit) + "   " + span,
-        kAttrNormal);
+    canvas.put(1, 1,
+               "min " + formatReading(low, series->decimals(), unit) + "   max " +
+                   formatReading(high, series->decimals(), unit) + "   " + span,
+               kAttrNormal);
 
     // The plot between the summary and the time labels.
     const int plotTop = 2;
