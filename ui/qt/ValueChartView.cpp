@@ -43,14 +43,14 @@ constexpr int kValueLabelPixels = 55;
 }  // namespace
 
 ValueChartView::ValueChartView(QWidget* parent) : QChartView(parent) {
-    auto* chart = new QChart();
+    // The view comes with a chart of its own; a chart set in its place would leave that one to nobody.
+    QChart* chart = this->chart();
     chart->setTheme(QChart::ChartThemeLight);
     chart->setBackgroundRoundness(0);
     chart->setDropShadowEnabled(false);
     chart->setMargins(QMargins(2, 4, 2, 2));
     chart->setAnimationOptions(QChart::NoAnimation);
     chart->legend()->hide();
-    setChart(chart);
     setRenderHint(QPainter::Antialiasing);
     setFrameShape(QFrame::NoFrame);
     setFocusPolicy(Qt::StrongFocus);
