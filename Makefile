@@ -2,10 +2,12 @@
 SHELL := /bin/bash
 .DEFAULT_GOAL := build
 
-# The Debian packages the project builds and tests with.
-# lintian checks the .deb; systemd brings systemd-analyze, which checks the user unit.
-DEBIAN_PACKAGES := build-essential cmake pkg-config clang libclang-rt-14-dev qt6-base-dev libexpat1-dev \
-                   libncurses-dev googletest libgtest-dev libbenchmark-dev tmux lintian systemd
+# The Debian packages the project builds and tests with. Qt Charts' CMake package needs Qt OpenGL's, which
+# qt6-charts-dev does not pull in by itself. lintian checks the .deb; systemd brings systemd-analyze, which
+# checks the user unit.
+DEBIAN_PACKAGES := build-essential cmake pkg-config clang libclang-rt-14-dev qt6-base-dev qt6-charts-dev \
+                   libqt6opengl6-dev libexpat1-dev libncurses-dev googletest libgtest-dev libbenchmark-dev \
+                   tmux lintian systemd
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 FUZZ_SECONDS ?= 30
 DEMO_TECHNOLOGY ?= lte

@@ -2,6 +2,7 @@
 
 #include <unistd.h>
 
+#include "core/platform/Clock.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
@@ -134,6 +135,7 @@ VelmarModelNodeRef VelmarModel::topLevelNodes() {
     auto paths = std::make_unique<NodePathDictionary>();
     _nodes = VelmarModelNode::makeTreeFromObject(display, *paths);
     _nodesByPath = std::move(paths);
+    history_.sample(*_nodesByPath, Clock::now());
     return _nodes;
 }
 

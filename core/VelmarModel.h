@@ -10,7 +10,8 @@
 // nodeAtPath. The state, the generator and the tree survive a restart. The receive port's name is the
 // process's own (monitorReceivePortName), so several monitors of one user each get a channel; the first
 // createPorts removes the receive-port files of monitors that ended without closing them. All of it runs on
-// one main queue.
+// one main queue. Each build of the tree (once per redraw) samples its numeric leaves into the value history,
+// which survives restarts and is cleared when the service answers another technology than before.
 #pragma once
 
 #include <memory>
@@ -18,6 +19,7 @@
 #include <string>
 
 #include "core/MonitorGenerator.h"
+#include "core/ValueHistory.h"
 #include "core/VelmarModelNode.h"
 #include "core/platform/MainQueue.h"
 #include "core/platform/MessagePort.h"
@@ -61,6 +63,7 @@ public:
     MonitorGenerator* generator() const { return _logGenerator.get(); }
     const PlistDictionaryRef& state() const { return _state; }
     void setReceivePortName(std::string name) { receivePortName_ = std::move(name); }
+    const ValueHistory& history() const { return history_; }
 
 private:
     std::optional<PlistData> onLogChannelMessage(std::int32_t messageId, ByteView data);
@@ -84,6 +87,8 @@ private:
     // This process's own receive port (see monitorReceivePortName); tests may choose another.
     std::string receivePortName_;
     bool staleReceivePortsRemoved_ = false;
+    ValueHistory history_;
+    std::string historyTechnology_;
     // Cleared when the model goes, so that redraw requests still queued do nothing.
     std::shared_ptr<bool> alive_ = std::make_shared<bool>(true);
 };

@@ -106,6 +106,10 @@ void VelmarModel::configureGenerator() {
     }
     const std::string* technology = answer->string();
     _logGenerator = technology && factory_ ? factory_(*technology) : nullptr;
+    if (_logGenerator && *technology != historyTechnology_) {
+        history_.clear();  // other paths, other meanings
+        historyTechnology_ = *technology;
+    }
     SystemLog::log(kLogError, "Got log generated: %p", static_cast<void*>(_logGenerator.get()));
 }
 

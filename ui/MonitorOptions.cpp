@@ -33,8 +33,8 @@ CommandLine monitorCommandLine(MonitorOptions& options, bool& pathGiven) {
         {.name = "--terminal",
          .value = "",
          .help = "full-screen terminal interface: arrow keys, PgUp/PgDn, Home/End move; Enter or the right "
-                 "arrow opens a row; left arrow, Backspace or Esc go back; s saves a snapshot (internal "
-                 "builds); q quits",
+                 "arrow opens a row; c charts a number over time; left arrow, Backspace or Esc go back; s "
+                 "saves a snapshot (internal builds); q quits",
          .apply = [chooseFrontEnd](
                       std::string_view) { return chooseFrontEnd(MonitorOptions::FrontEnd::Terminal); },
          .synopsis = "[--terminal | --headless [--path PATH]]"},

@@ -6,6 +6,7 @@
 #include <cstdlib>
 
 #include "core/ArrayLock.h"
+#include "core/platform/Clock.h"
 #include "core/platform/PollMainQueue.h"
 #include "core/platform/StringFormat.h"
 #include "core/platform/SystemLog.h"
@@ -60,6 +61,7 @@ protected:
     }
     void TearDown() override {
         model_.reset();
+        Clock::setNowForTesting(std::nullopt);
         MainQueue::setCurrent(nullptr);
         ArrayLock::releaseOutstandingForTesting();
     }
@@ -297,6 +299,61 @@ TEST_F(VelmarModelTest, SendPortDyingIsFoundByTheNextTick) {
     // The restart finds the service still there and comes up on a new channel.
     EXPECT_EQ(service.channelsCreated(), 2);
     EXPECT_TRUE(model().isConnected());
+}
+
+TEST_F(VelmarModelTest, EachTreeBuildSamplesTheNumericLeavesKeptAcrossReconnectsClearedOnAnotherTechnology) {
+    Clock::setNowForTesting(1000.0);
+    std::vector<std::string> served;
+    VelmarModel model(
+        [&served](std::string_view technology) -> std::unique_ptr<MonitorGenerator> {
+            served.emplace_back(technology);
+            return std::make_unique<CountingGenerator>();
+        },
+        queue_, &redraws_);
+    auto service = std::make_unique<FakeTelephonyService>();
+    model.restartMonitor();
+    ASSERT_TRUE(model.isConnected());
+    service->sendBlob(blob(20));
+    ASSERT_TRUE(queue_.runUntil([&] { return model.isUpdated(); }, 5.0));
+    ASSERT_TRUE(model.topLevelNodes());
+    // "Blobs", "Last length" and "Cell/PCI" read as numbers.
+    EXPECT_EQ(model.history().seriesCount(), 3u);
+    ASSERT_TRUE(model.history().series("/Cell/PCI"));
+    EXPECT_EQ(model.history().series("/Cell/PCI")->newest().value, 101.0);
+    EXPECT_EQ(model.history().series("/Last length")->newest().time, 1000.0);
+    // The tree is built once per acting tick: asking again samples nothing more.
+    model.nodeAtPath("/Cell/PCI");
+    model.topLevelNodes();
+    EXPECT_EQ(model.history().series("/Cell/PCI")->size(), 1u);
+    model.refresh();
+    Clock::setNowForTesting(1002.0);
+    service->sendBlob(blob(30));
+    ASSERT_TRUE(queue_.runUntil([&] { return model.isUpdated(); }, 5.0));
+    model.refresh();
+    model.topLevelNodes();
+    EXPECT_EQ(model.history().series("/Cell/PCI")->size(), 2u);
+    EXPECT_EQ(model.history().series("/Last length")->newest().value, 30.0);
+
+    // The service goes and comes back with the same technology: the history stays.
+    service.reset();
+    queue_.runUntil([&] { return !model.isConnected(); }, 5.0);
+    service = std::make_unique<FakeTelephonyService>();
+    model.restartMonitor();
+    ASSERT_TRUE(model.isConnected());
+    EXPECT_EQ(model.history().series("/Cell/PCI")->size(), 2u);
+    service->sendBlob(blob(40));
+    ASSERT_TRUE(queue_.runUntil([&] { return model.isUpdated(); }, 5.0));
+
+    // Another technology: other paths, other meanings; the history starts again.
+    service.reset();
+    queue_.runUntil([&] { return !model.isConnected(); }, 5.0);
+    service = std::make_unique<FakeTelephonyService>(
+        FakeTelephonyService::Behaviour{.technology = "kKxLogChannelTechnology_Orvane_GSM"});
+    model.restartMonitor();
+    ASSERT_TRUE(model.isConnected());
+    EXPECT_EQ(served.size(), 3u);
+    EXPECT_EQ(model.history().seriesCount(), 0u);
+    model.destroyPorts();
 }
 
 }  // namespace

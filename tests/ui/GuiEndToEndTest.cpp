@@ -15,6 +15,7 @@
 #include "tests/support/TestPaths.h"
 #include "tests/ui/ChangingValues.h"
 #include "tests/ui/KxServerProcess.h"
+#include "tests/ui/LiveGuiTest.h"
 #include "tests/ui/QtTestApplication.h"
 #include "ui/qt/NavigationController.h"
 #include "ui/qt/QtMainQueue.h"
@@ -25,24 +26,8 @@
 namespace velmar {
 namespace {
 
-class GuiEndToEndTest : public ::testing::Test {
+class GuiEndToEndTest : public testing::LiveGuiTest {
   protected:
-    void SetUp() override {
-        testing::qtTestApplication();
-        setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
-        setenv("XDG_CONFIG_HOME", config_.path().c_str(), 1);
-        setenv("XDG_STATE_HOME", state_.path().c_str(), 1);
-        unsetenv("VELMAR_SYSROOT");
-        MainQueue::setCurrent(&queue_);
-    }
-    void TearDown() override {
-        app_.reset();
-        QApplication::processEvents();
-        MainQueue::setCurrent(nullptr);
-        ArrayLock::releaseOutstandingForTesting();
-    }
-
-    NavigationController& navigation() { return *app_->navigationController(); }
     VelmarPaneController& top() { return *navigation().topPane(); }
     QString status() { return top().toolbar()->statusLabel()->text(); }
     // Waits for the next redraw that brings a new update time.
@@ -91,12 +76,6 @@ class GuiEndToEndTest : public ::testing::Test {
         }
         return top().path() == (path.empty() ? "/" : path);
     }
-
-    testing::TemporaryDirectory runtime_;
-    testing::TemporaryDirectory config_;
-    testing::TemporaryDirectory state_;
-    QtMainQueue queue_;
-    std::unique_ptr<VelmarApp> app_;
 };
 
 TEST_F(GuiEndToEndTest, ConnectsShowsChangingValuesSurvivesTheServiceDyingAndReconnects) {
@@ -104,9 +83,7 @@ TEST_F(GuiEndToEndTest, ConnectsShowsChangingValuesSurvivesTheServiceDyingAndRec
     ASSERT_TRUE(service.start()) << service.description();
     std::cout << "service: " << service.description() << std::endl;
 
-    app_ = std::make_unique<VelmarApp>(
-        [](std::string_view technology) { return LogGenerator::generatorFromTechnology(technology); },
-        queue_);
+    makeApp();
     QElapsedTimer clock;
     clock.start();
     app_->applicationDidFinishLaunching(false);

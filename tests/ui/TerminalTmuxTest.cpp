@@ -401,6 +401,121 @@ TEST_F(TerminalTmuxTest, ScreenLayoutKeysResizeSaveAndQuit) {
     EXPECT_EQ(preferences->dictionary()->get("HxShowGSMRSSI"), PlistValue::boolean(false));
 }
 
+TEST_F(TerminalTmuxTest, COpensTheLiveChartOfAValueInBrailleOrAsciiAndEscGoesBack) {
+    testing::KxServerProcess service(runtime_.path());
+    ASSERT_TRUE(service.start()) << service.description();
+    const std::string pane = "/Serving Cell/Connected mode LTE Intra-frequency Measurement";
+    const std::string value = "Serving Filtered RSRP";
+    auto isUpdated = [](const auto& shown) { return startsWith(footer(shown), "   Updated "); };
+    // Opens the pane, puts the cursor on the value and presses c; answers the chart's screen.
+    auto openChart = [&](TmuxSession& session, std::vector<std::string>& lines) {
+        ASSERT_TRUE(session.waitFor(isUpdated, 5, &lines)) << footer(lines);
+        ASSERT_TRUE(openPath(session, pane));
+        lines = session.screen();
+        int row = -1;
+        for (std::size_t i = 1; i + 1 < lines.size(); ++i) {
+            if (startsWith(lines[i], " " + value + " ")) {
+                row = static_cast<int>(i) - 1;
+            }
+        }
+        ASSERT_GE(row, 0) << value;
+        session.keys(std::vector<std::string>(static_cast<std::size_t>(row), "Down"));
+        ASSERT_TRUE(session.waitFor(
+            [](const auto& shown) { return footer(shown).find("[c] Chart  [q] Quit") != std::string::npos; },
+            3, &lines))
+            << footer(lines);
+        session.keys({"c"});
+        ASSERT_TRUE(session.waitFor(
+            [&](const auto& shown) {
+                return shown.size() == kRows && startsWith(shown[0], " " + value + " ") &&
+                       startsWith(shown[1], " min ");
+            },
+            3, &lines))
+            << (lines.empty() ? "" : lines[0]);
+    };
+    auto plotText = [](const std::vector<std::string>& shown) {
+        std::string plot;
+        for (int row = 2; row < kRows - 2; ++row) {
+            plot += shown[static_cast<std::size_t>(row)];
+        }
+        return plot;
+    };
+
+    TmuxSession session;
+    ASSERT_TRUE(session.start(environment(), {VELMAR_PATH, "--terminal"}));
+    std::vector<std::string> lines;
+    openChart(session, lines);
+    if (HasFatalFailure()) {
+        return;
+    }
+    EXPECT_EQ(lines[0].substr(lines[0].size() - 4), " dBm") << lines[0];
+    EXPECT_NE(lines[1].find(" dBm   max "), std::string::npos) << lines[1];
+    EXPECT_NE(lines[1].find("   last 10 min"), std::string::npos) << lines[1];
+    EXPECT_NE(footer(lines).find("[+/-] Zoom  [Esc] Back  [q] Quit"), std::string::npos) << footer(lines);
+    // Live: the next redraws bring more samples; the line is drawn in braille (U+2800..U+28FF, E2 A0-A3 ..).
+    const std::string before = footer(lines);
+    ASSERT_TRUE(session.waitFor(
+        [&](const auto& shown) { return footer(shown) != before && isUpdated(shown); }, 15, &lines));
+    ASSERT_TRUE(session.waitFor(
+        [&](const auto& shown) {
+            const std::string plot = plotText(shown);
+            for (std::size_t i = 0; i + 1 < plot.size(); ++i) {
+                const auto lead = static_cast<unsigned char>(plot[i]);
+                const auto next = static_cast<unsigned char>(plot[i + 1]);
+                if (lead == 0xE2 && next >= 0xA0 && next <= 0xA3) {
+                    return true;
+                }
+            }
+            return false;
+        },
+        15, &lines));
+    EXPECT_NE(plotText(lines).find("┤"), std::string::npos);
+    keepScreen("terminal-chart.txt", lines);
+    session.keys({"-"});
+    EXPECT_TRUE(session.waitFor(
+        [](const auto& shown) {
+            return shown.size() > 1 && shown[1].find("   last 20 min") != std::string::npos;
+        },
+        3));
+    // Esc goes back to the pane, the cursor still on the value.
+    session.keys({"Escape"});
+    ASSERT_TRUE(session.waitFor(
+        [&](const auto& shown) { return !shown.empty() && startsWith(shown[0], " Connected mode LTE "); }, 3,
+        &lines))
+        << lines[0];
+    session.keys({"q"});
+    EXPECT_TRUE(session.waitFor([&](const auto&) { return !session.alive(); }, 5));
+
+    // A terminal that is not UTF-8: the same chart in plain ASCII, the line drawn with "*".
+    std::vector<std::string> ascii = environment();
+    for (std::string& variable : ascii) {
+        if (startsWith(variable, "LANG=") || startsWith(variable, "LC_ALL=")) {
+            variable = variable.substr(0, variable.find('=') + 1) + "C";
+        }
+    }
+    TmuxSession plain;
+    ASSERT_TRUE(plain.start(ascii, {VELMAR_PATH, "--terminal"}));
+    openChart(plain, lines);
+    if (HasFatalFailure()) {
+        return;
+    }
+    ASSERT_TRUE(plain.waitFor(
+        [&](const auto& shown) { return plotText(shown).find('*') != std::string::npos; }, 15, &lines));
+    for (const std::string& line : lines) {
+        for (const char c : line) {
+            EXPECT_LT(static_cast<unsigned char>(c), 0x80) << line;
+        }
+    }
+    EXPECT_NE(plotText(lines).find('+'), std::string::npos);
+    keepScreen("terminal-chart-ascii.txt", lines);
+    plain.keys({"Left"});
+    ASSERT_TRUE(plain.waitFor(
+        [&](const auto& shown) { return !shown.empty() && startsWith(shown[0], " Connected mode LTE "); },
+        3));
+    plain.keys({"q"});
+    EXPECT_TRUE(plain.waitFor([&](const auto&) { return !plain.alive(); }, 5));
+}
+
 TEST_F(TerminalTmuxTest, WithoutTheMarkerTheFooterOffersNoSaveAndSDoesNothing) {
     TmuxSession session;
     ASSERT_TRUE(session.start(environment(), {VELMAR_PATH, "--terminal"}));

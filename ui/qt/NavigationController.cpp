@@ -118,11 +118,19 @@ Pane& NavigationController::paneAt(std::size_t index) {
     return *panes_.at(index);
 }
 
+VelmarPaneController* NavigationController::pane(std::size_t index) const {
+    return qobject_cast<VelmarPaneController*>(panes_.at(index));
+}
+
+VelmarPaneController* NavigationController::topPane() const {
+    return qobject_cast<VelmarPaneController*>(topScreen());
+}
+
 QRect NavigationController::paneArea() const {
     return area_->rect();
 }
 
-void NavigationController::setRootPane(VelmarPaneController* pane) {
+void NavigationController::setRootPane(NavigationScreen* pane) {
     finishAnimation();
     pane->setParent(area_);
     panes_.assign(1, pane);
@@ -136,9 +144,9 @@ void NavigationController::setRootPane(VelmarPaneController* pane) {
     updateTitleBar();
 }
 
-void NavigationController::pushPane(VelmarPaneController* pane, bool animated) {
+void NavigationController::pushPane(NavigationScreen* pane, bool animated) {
     finishAnimation();
-    VelmarPaneController* outgoing = topPane();
+    NavigationScreen* outgoing = topScreen();
     if (outgoing != nullptr) {
         outgoing->viewWillDisappear();
     }
@@ -163,12 +171,12 @@ void NavigationController::popToPane(std::size_t index, bool animated) {
         return;
     }
     finishAnimation();
-    VelmarPaneController* outgoing = topPane();
+    NavigationScreen* outgoing = topScreen();
     outgoing->viewWillDisappear();
-    std::vector<VelmarPaneController*> discarded(panes_.begin() + static_cast<std::ptrdiff_t>(index) + 1,
+    std::vector<NavigationScreen*> discarded(panes_.begin() + static_cast<std::ptrdiff_t>(index) + 1,
                                                  panes_.end());
     panes_.resize(index + 1);
-    VelmarPaneController* incoming = topPane();
+    NavigationScreen* incoming = topScreen();
     incoming->viewWillAppear();
     if (willShow_) {
         willShow_(*incoming);
@@ -177,9 +185,8 @@ void NavigationController::popToPane(std::size_t index, bool animated) {
     transition(incoming, outgoing, false, animated, std::move(discarded));
 }
 
-void NavigationController::transition(VelmarPaneController* incoming, VelmarPaneController* outgoing,
-                                      bool forward, bool animated,
-                                      std::vector<VelmarPaneController*> discarded) {
+void NavigationController::transition(NavigationScreen* incoming, NavigationScreen* outgoing, bool forward,
+                                      bool animated, std::vector<NavigationScreen*> discarded) {
     const QRect area = paneArea();
     const int width = area.width();
     incoming->setGeometry(area);
@@ -190,7 +197,7 @@ void NavigationController::transition(VelmarPaneController* incoming, VelmarPane
             outgoing->hide();
             outgoing->setGeometry(area);
         }
-        for (VelmarPaneController* pane : discarded) {
+        for (NavigationScreen* pane : discarded) {
             pane->hide();
             pane->deleteLater();
         }
@@ -248,7 +255,7 @@ void NavigationController::finishAnimation() {
     }
 }
 
-void NavigationController::paneTitleChanged(VelmarPaneController* pane) {
+void NavigationController::paneTitleChanged(NavigationScreen* pane) {
     const std::size_t count = panes_.size();
     if ((count >= 1 && panes_[count - 1] == pane) || (count >= 2 && panes_[count - 2] == pane)) {
         updateTitleBar();
@@ -256,7 +263,7 @@ void NavigationController::paneTitleChanged(VelmarPaneController* pane) {
 }
 
 void NavigationController::updateTitleBar() {
-    VelmarPaneController* top = topPane();
+    NavigationScreen* top = topScreen();
     const bool canGoBack = panes_.size() > 1;
     back_->setVisible(canGoBack);
     static_cast<TitleBar*>(bar_)->setTitles(top ? top->title() : QString(),
@@ -266,7 +273,7 @@ void NavigationController::updateTitleBar() {
 bool NavigationController::eventFilter(QObject* watched, QEvent* event) {
     if (watched == area_ && event->type() == QEvent::Resize) {
         finishAnimation();
-        if (VelmarPaneController* top = topPane()) {
+        if (NavigationScreen* top = topScreen()) {
             top->setGeometry(paneArea());
         }
     }

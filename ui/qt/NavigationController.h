@@ -1,5 +1,5 @@
-// NavigationController: the navigation stack of panes with its title bar (a back button naming the pane
-// below, the top pane's title) and animated pushes and pops.
+// NavigationController: the navigation stack of screens (panes and charts) with its title bar (a back button
+// naming the screen below, the top screen's title) and animated pushes and pops.
 //
 // Contract: as a NavigationStack, paneCount() and paneAt() count only the panes that are on the stack; a pane
 // being popped leaves the stack at once and is deleted when its slide-out animation ends. Before a pane comes
@@ -17,6 +17,7 @@
 #include <vector>
 
 #include "ui/Pane.h"
+#include "ui/qt/NavigationScreen.h"
 
 namespace velmar {
 
@@ -33,24 +34,27 @@ class NavigationController : public QWidget, public NavigationStack {
     ~NavigationController() override;
 
     // navigationController:willShowViewController:animated:
-    void setWillShowDelegate(std::function<void(VelmarPaneController&)> delegate) {
+    void setWillShowDelegate(std::function<void(NavigationScreen&)> delegate) {
         willShow_ = std::move(delegate);
     }
-    void setRootPane(VelmarPaneController* pane);
-    void pushPane(VelmarPaneController* pane, bool animated);
+    void setRootPane(NavigationScreen* pane);
+    void pushPane(NavigationScreen* pane, bool animated);
     void popPane(bool animated);
 
     std::size_t paneCount() const override { return panes_.size(); }
     Pane& paneAt(std::size_t index) override;
     void popToPane(std::size_t index, bool animated) override;
 
-    VelmarPaneController* pane(std::size_t index) const { return panes_.at(index); }
-    VelmarPaneController* topPane() const { return panes_.empty() ? nullptr : panes_.back(); }
+    NavigationScreen* screen(std::size_t index) const { return panes_.at(index); }
+    NavigationScreen* topScreen() const { return panes_.empty() ? nullptr : panes_.back(); }
+    // The pane of the display tree at index or on top; null when that screen is a chart.
+    VelmarPaneController* pane(std::size_t index) const;
+    VelmarPaneController* topPane() const;
     bool isAnimating() const { return animation_ != nullptr; }
     // Ends a running transition at once.
     void finishAnimation();
     // A pane's title changed; the bar follows when it is the top pane or the one below it.
-    void paneTitleChanged(VelmarPaneController* pane);
+    void paneTitleChanged(NavigationScreen* pane);
 
     QLabel* titleLabel() const { return title_; }
     QToolButton* backButton() const { return back_; }
@@ -60,8 +64,8 @@ class NavigationController : public QWidget, public NavigationStack {
     void keyPressEvent(QKeyEvent* event) override;
 
   private:
-    void transition(VelmarPaneController* incoming, VelmarPaneController* outgoing, bool forward,
-                    bool animated, std::vector<VelmarPaneController*> discarded);
+    void transition(NavigationScreen* incoming, NavigationScreen* outgoing, bool forward, bool animated,
+                    std::vector<NavigationScreen*> discarded);
     void updateTitleBar();
     QRect paneArea() const;
 
@@ -69,8 +73,8 @@ class NavigationController : public QWidget, public NavigationStack {
     QToolButton* back_;
     QLabel* title_;
     QWidget* area_;
-    std::vector<VelmarPaneController*> panes_;
-    std::function<void(VelmarPaneController&)> willShow_;
+    std::vector<NavigationScreen*> panes_;
+    std::function<void(NavigationScreen&)> willShow_;
     QVariantAnimation* animation_ = nullptr;
     std::function<void()> finishTransition_;
 };

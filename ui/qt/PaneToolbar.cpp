@@ -9,6 +9,20 @@ namespace velmar {
 namespace {
 const QColor kBarColour(0xf7, 0xf7, 0xf7);
 const QColor kBorderColour(0xb2, 0xb2, 0xb2);
+
+// A flat text button in the tint of the title bar's back button, as on a touch screen.
+QToolButton* barButton(QWidget* parent, const QString& text, const QString& name) {
+    auto* button = new QToolButton(parent);
+    button->setText(text);
+    button->setObjectName(name);
+    button->setStyleSheet(QStringLiteral("QToolButton { border: none; padding: 0 6px; color: #007aff; }"));
+    button->setFocusPolicy(Qt::NoFocus);
+    QFont font = QApplication::font();
+    font.setPixelSize(17);
+    button->setFont(font);
+    button->setCursor(Qt::PointingHandCursor);
+    return button;
+}
 }  // namespace
 
 PaneToolbar::PaneToolbar(QWidget* parent) : QWidget(parent) {
@@ -30,6 +44,20 @@ PaneToolbar::PaneToolbar(QWidget* parent) : QWidget(parent) {
     status_->setSizePolicy(QSizePolicy::Fixed, QSizePolicy::Preferred);
     layout->addWidget(status_);
     layout->addStretch(1);
+    chartButton_ = barButton(this, QStringLiteral("Chart"), QStringLiteral("chartButton"));
+    chartButton_->setVisible(false);
+    connect(chartButton_, &QToolButton::clicked, this, [this] {
+        if (chartAction_) {
+            chartAction_();
+        }
+    });
+    layout->addWidget(chartButton_);
+}
+
+void PaneToolbar::setChartButtonShown(bool shown) {
+    if (chartButton_->isVisibleTo(this) != shown) {
+        chartButton_->setVisible(shown);
+    }
 }
 
 void PaneToolbar::setItems(const QString& status, bool isLoading, bool withSaveButton) {
@@ -42,16 +70,7 @@ void PaneToolbar::setItems(const QString& status, bool isLoading, bool withSaveB
         status_->setText(status);
     }
     if (withSaveButton && saveButton_ == nullptr) {
-        saveButton_ = new QToolButton(this);
-        saveButton_->setText(QStringLiteral("Save"));
-        saveButton_->setObjectName(QStringLiteral("saveButton"));
-        saveButton_->setStyleSheet(
-            QStringLiteral("QToolButton { border: none; padding: 0 6px; color: #007aff; }"));
-        saveButton_->setFocusPolicy(Qt::NoFocus);
-        QFont font = QApplication::font();
-        font.setPixelSize(17);
-        saveButton_->setFont(font);
-        saveButton_->setCursor(Qt::PointingHandCursor);
+        saveButton_ = barButton(this, QStringLiteral("Save"), QStringLiteral("saveButton"));
         connect(saveButton_, &QToolButton::clicked, this, [this] {
             if (saveAction_) {
                 saveAction_();

@@ -1,11 +1,13 @@
 #include "ui/qt/TableView.h"
 
+#include <QGuiApplication>
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QPainter>
 #include <QPainterPath>
 #include <QScrollBar>
 #include <QScroller>
+#include <QStyleHints>
 #include <algorithm>
 
 namespace velmar {
@@ -77,14 +79,58 @@ void TableViewCell::paintEvent(QPaintEvent*) {
 void TableViewCell::mousePressEvent(QMouseEvent* event) {
     if (event->button() == Qt::LeftButton) {
         pressed_ = true;
+        longPressed_ = false;
+        pressPosition_ = event->position().toPoint();
+        pressScroll_ = table_ != nullptr ? table_->scrollPosition() : 0;
+        longPressTimer_.start(QGuiApplication::styleHints()->mousePressAndHoldInterval(), this);
         update();
         event->accept();
+        return;
+    }
+    if (event->button() == Qt::RightButton && table_ != nullptr) {
+        event->accept();
+        table_->cellLongPressed(this);
         return;
     }
     QWidget::mousePressEvent(event);
 }
 
+void TableViewCell::mouseMoveEvent(QMouseEvent* event) {
+    if (longPressTimer_.isActive() && (event->position().toPoint() - pressPosition_).manhattanLength() >
+                                          QGuiApplication::styleHints()->startDragDistance()) {
+        longPressTimer_.stop();  // a drag, not a press
+    }
+    QWidget::mouseMoveEvent(event);
+}
+
+void TableViewCell::timerEvent(QTimerEvent* event) {
+    if (event->timerId() != longPressTimer_.timerId()) {
+        QWidget::timerEvent(event);
+        return;
+    }
+    longPressTimer_.stop();
+    if (!pressed_ || table_ == nullptr || table_->scrollPosition() != pressScroll_) {
+        return;  // the finger scrolled the list meanwhile
+    }
+    pressed_ = false;
+    longPressed_ = true;
+    update();
+    table_->cellLongPressed(this);
+}
+
+void TableViewCell::cancelPress() {
+    pressed_ = false;
+    longPressed_ = false;
+    longPressTimer_.stop();
+}
+
 void TableViewCell::mouseReleaseEvent(QMouseEvent* event) {
+    longPressTimer_.stop();
+    if (event->button() == Qt::LeftButton && longPressed_) {
+        longPressed_ = false;
+        event->accept();
+        return;  // the end of a long press is no tap
+    }
     if (event->button() != Qt::LeftButton || !pressed_) {
         QWidget::mouseReleaseEvent(event);
         return;
@@ -231,7 +277,7 @@ void TableView::layoutCells() {
         if (cell->isVisible()) {
             cell->hide();
         }
-        cell->pressed_ = false;
+        cell->cancelPress();
     }
     layingOut_ = false;
 }
@@ -296,8 +342,23 @@ void TableView::activateRow(int row) {
     }
 }
 
+void TableView::longPressRow(int row) {
+    if (row < 0 || row >= rows_ || dataSource_ == nullptr) {
+        return;
+    }
+    dataSource_->didLongPressRow(*this, row);
+}
+
 void TableView::cellTapped(TableViewCell* cell) {
     activateRow(rowForCell(cell));
+}
+
+void TableView::cellLongPressed(TableViewCell* cell) {
+    longPressRow(rowForCell(cell));
+}
+
+int TableView::scrollPosition() const {
+    return verticalScrollBar()->value();
 }
 
 void TableView::keyPressEvent(QKeyEvent* event) {
@@ -333,6 +394,13 @@ void TableView::keyPressEvent(QKeyEvent* event) {
         case Qt::Key_Right:
             if (current >= 0) {
                 activateRow(current);
+                event->accept();
+                return;
+            }
+            break;
+        case Qt::Key_Menu:
+            if (current >= 0) {
+                longPressRow(current);
                 event->accept();
                 return;
             }

@@ -7,11 +7,15 @@
 // again for each visible row, so a row usually gets back the very cell it had (nothing moves, nothing
 // flickers); which cell a row gets is otherwise the queue's business, whatever kind of cell it is. The
 // scroll position is kept (clamped to the new height) and so is the selected row while it exists. A tap on a
-// row, or Enter / Return / → on the selected row, selects it and tells the data source. ↑ ↓ PgUp PgDn Home
-// End move the selection. Scrolling is kinetic (QScroller) for touch and mouse drags.
+// row, or Enter / Return / → on the selected row, selects it and tells the data source. A long press (held
+// for the platform's press-and-hold interval without moving or scrolling), a right click, or the Menu key on
+// the selected row tells the data source of a long press instead, without selecting; the release that ends
+// a long press is no tap. ↑ ↓ PgUp PgDn Home End move the selection. Scrolling is kinetic (QScroller) for
+// touch and mouse drags.
 #pragma once
 
 #include <QAbstractScrollArea>
+#include <QBasicTimer>
 #include <QString>
 #include <deque>
 #include <functional>
@@ -46,14 +50,22 @@ class TableViewCell : public QWidget {
     void paintEvent(QPaintEvent* event) override;
     void resizeEvent(QResizeEvent* event) override;
     void mousePressEvent(QMouseEvent* event) override;
+    void mouseMoveEvent(QMouseEvent* event) override;
     void mouseReleaseEvent(QMouseEvent* event) override;
+    void timerEvent(QTimerEvent* event) override;
 
   private:
     friend class TableView;
+    void cancelPress();
+
     QString reuseIdentifier_;
     Accessory accessory_ = Accessory::None;
     bool selected_ = false;
     bool pressed_ = false;
+    bool longPressed_ = false;
+    QBasicTimer longPressTimer_;
+    QPoint pressPosition_;
+    int pressScroll_ = 0;
     TableView* table_ = nullptr;
 };
 
@@ -63,6 +75,7 @@ class TableViewDataSource {
     virtual int numberOfRows(TableView& table) = 0;
     virtual TableViewCell* cellForRow(TableView& table, int row) = 0;
     virtual void didSelectRow(TableView& table, int row) { (void)table, (void)row; }
+    virtual void didLongPressRow(TableView& table, int row) { (void)table, (void)row; }
 };
 
 class TableView : public QAbstractScrollArea {
@@ -94,6 +107,8 @@ class TableView : public QAbstractScrollArea {
     void scrollToRow(int row);
     // Selects a row and tells the data source, as a tap does.
     void activateRow(int row);
+    // Tells the data source of a long press on a row.
+    void longPressRow(int row);
 
     // Cells created so far (to check reuse).
     int cellsOnScreen() const { return static_cast<int>(visible_.size()); }
@@ -107,6 +122,8 @@ class TableView : public QAbstractScrollArea {
   private:
     friend class TableViewCell;
     void cellTapped(TableViewCell* cell);
+    void cellLongPressed(TableViewCell* cell);
+    int scrollPosition() const;
     void updateScrollRange();
     void layoutCells();
     void enqueue(TableViewCell* cell);

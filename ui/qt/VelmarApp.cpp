@@ -33,7 +33,7 @@ void VelmarApp::applicationDidFinishLaunching(bool fullscreen) {
     layout->setSpacing(0);
     _navController = new NavigationController(_window.get());
     _navController->setWillShowDelegate(
-        [this](VelmarPaneController& pane) { shell_.navigationWillShow(pane); });
+        [this](NavigationScreen& screen) { shell_.navigationWillShow(screen); });
     layout->addWidget(_navController);
     _window->installEventFilter(this);
     auto* save = new QShortcut(QKeySequence::Save, _window.get());
@@ -88,7 +88,7 @@ void VelmarApp::dismissSaveScreen(bool animated) {
         view->dismiss(animated);
     }
     if (_navController != nullptr) {
-        if (VelmarPaneController* top = _navController->topPane()) {
+        if (NavigationScreen* top = _navController->topScreen()) {
             top->setFocus();
         }
     }

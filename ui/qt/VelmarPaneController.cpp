@@ -1,8 +1,11 @@
 #include "ui/qt/VelmarPaneController.h"
 
 #include <QVBoxLayout>
+#include <algorithm>
 
+#include "core/ValueHistory.h"
 #include "ui/qt/NavigationController.h"
+#include "ui/qt/VelmarChartController.h"
 #include "ui/qt/VelmarApp.h"
 #include "ui/qt/VelmarCell.h"
 
@@ -10,10 +13,7 @@ namespace velmar {
 
 VelmarPaneController::VelmarPaneController(VelmarModelNodeRef node, std::string path, VelmarApp& application)
     : _nodes(std::move(node)), _keyPath(std::move(path)), application_(application) {
-    setAutoFillBackground(true);
-    QPalette palette = this->palette();
-    palette.setColor(QPalette::Window, Qt::white);
-    setPalette(palette);
+    paintWhite();
     auto* layout = new QVBoxLayout(this);
     layout->setContentsMargins(0, 0, 0, 0);
     layout->setSpacing(0);
@@ -23,9 +23,10 @@ VelmarPaneController::VelmarPaneController(VelmarModelNodeRef node, std::string 
     layout->addWidget(table_, 1);
     toolbar_ = new PaneToolbar(this);
     toolbar_->setSaveAction([this] { application_.showSaveView(); });
+    toolbar_->setChartAction([this] { pushChart(ChartKind::Pane, _nodes, _keyPath); });
     layout->addWidget(toolbar_);
     setFocusProxy(table_);
-    title_ = title();
+    updateTitle(nullptr);
     table_->reloadData();
 }
 
@@ -33,27 +34,10 @@ QString VelmarPaneController::title() const {
     return _nodes ? QString::fromStdString(_nodes->displayName()) : QString::fromUtf8(kNoNodeTitle);
 }
 
-void VelmarPaneController::updateTitle() {
-    const QString current = title();
-    if (current != title_) {
-        title_ = current;
-        if (NavigationController* navigation = application_.navigationController()) {
-            navigation->paneTitleChanged(this);
-        }
-    }
-}
-
 void VelmarPaneController::viewWillAppear() {
-    updateTitle();
+    updateTitle(application_.navigationController());
     toolbar_->setVisible(true);
     createToolbarItems();
-}
-
-void VelmarPaneController::viewWillDisappear() {
-    // Gives up first-responder status.
-    if (QWidget* focused = focusWidget(); focused != nullptr && isAncestorOf(focused)) {
-        focused->clearFocus();
-    }
 }
 
 void VelmarPaneController::setStatus(const std::string& status, bool isLoading) {
@@ -68,13 +52,23 @@ void VelmarPaneController::setStatus(const char* status, bool isLoading) {
 
 void VelmarPaneController::reloadWithNode(const VelmarModelNodeRef& node) {
     _nodes = node;
-    updateTitle();
+    updateTitle(application_.navigationController());
     table_->reloadData();
     createToolbarItems();
 }
 
 void VelmarPaneController::createToolbarItems() {
     toolbar_->setItems(QString::fromStdString(_status), _isLoading, application_.allowSaveButton());
+    toolbar_->setChartButtonShown(hasNumericLeaves());
+}
+
+bool VelmarPaneController::hasNumericLeaves() const {
+    const NodeList* children = _nodes ? _nodes->childNodes() : nullptr;
+    if (children == nullptr) {
+        return false;
+    }
+    return std::any_of(children->begin(), children->end(),
+                       [](const VelmarModelNodeRef& child) { return isNumericLeaf(child.get()); });
 }
 
 const VelmarModelNodeRef* VelmarPaneController::childAt(int row) const {
@@ -136,6 +130,25 @@ void VelmarPaneController::didSelectRow(TableView& table, int row) {
         new VelmarPaneController(*child, joinDisplayPath(_keyPath, (*child)->displayName()), application_);
     pane->setStatus(_status, _isLoading);
     navigation->pushPane(pane, true);
+}
+
+void VelmarPaneController::didLongPressRow(TableView&, int row) {
+    const VelmarModelNodeRef* child = childAt(row);
+    if (child == nullptr || !isNumericLeaf(child->get())) {
+        return;  // only a number has a chart
+    }
+    pushChart(ChartKind::Value, *child,
+              joinDisplayPath(_keyPath, (*child)->displayName()));
+}
+
+void VelmarPaneController::pushChart(ChartKind kind, const VelmarModelNodeRef& node, std::string path) {
+    NavigationController* navigation = application_.navigationController();
+    if (navigation == nullptr || !node) {
+        return;
+    }
+    auto* chart = new VelmarChartController(kind, node, std::move(path), application_);
+    chart->setStatus(_status, _isLoading);
+    navigation->pushPane(chart, true);
 }
 
 }  // namespace velmar

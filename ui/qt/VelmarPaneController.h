@@ -7,21 +7,24 @@
 // only deselects it; tapping an inner child pushes a new pane for it, at this pane's path joined with the
 // child's name, carrying this pane's status. The title is the node's name, "Velmar" without a node.
 // reloadWithNode keeps the scroll position and the selected row. setStatus with a null text shows an empty
-// status.
+// status. Where the node has leaves whose values read as numbers, the toolbar offers the chart button, which
+// pushes the chart of those leaves; a long press or right click on such a leaf's row pushes the chart of
+// that value alone.
 #pragma once
 
 #include <QWidget>
 #include <string>
 
-#include "ui/Pane.h"
+#include "ui/qt/NavigationScreen.h"
 #include "ui/qt/PaneToolbar.h"
 #include "ui/qt/TableView.h"
 
 namespace velmar {
 
 class VelmarApp;
+enum class ChartKind;
 
-class VelmarPaneController : public QWidget, public Pane, public TableViewDataSource {
+class VelmarPaneController : public NavigationScreen, public TableViewDataSource {
     Q_OBJECT
 
   public:
@@ -37,11 +40,12 @@ class VelmarPaneController : public QWidget, public Pane, public TableViewDataSo
     // A null text is an empty status.
     void setStatus(const char* status, bool isLoading);
 
-    void viewWillAppear();
-    void viewWillDisappear();
+    void viewWillAppear() override;
     void createToolbarItems();
 
-    QString title() const;
+    QString title() const override;
+    // Whether the node has a leaf whose value reads as a number.
+    bool hasNumericLeaves() const;
     const VelmarModelNodeRef& node() const { return _nodes; }
     const std::string& status() const { return _status; }
     bool isLoading() const { return _isLoading; }
@@ -51,10 +55,11 @@ class VelmarPaneController : public QWidget, public Pane, public TableViewDataSo
     int numberOfRows(TableView& table) override;
     TableViewCell* cellForRow(TableView& table, int row) override;
     void didSelectRow(TableView& table, int row) override;
+    void didLongPressRow(TableView& table, int row) override;
 
   private:
     const VelmarModelNodeRef* childAt(int row) const;
-    void updateTitle();
+    void pushChart(ChartKind kind, const VelmarModelNodeRef& node, std::string path);
 
     VelmarModelNodeRef _nodes;
     std::string _keyPath;
@@ -63,7 +68,6 @@ class VelmarPaneController : public QWidget, public Pane, public TableViewDataSo
     VelmarApp& application_;
     TableView* table_;
     PaneToolbar* toolbar_;
-    QString title_;
 };
 
 }  // namespace velmar

@@ -9,6 +9,7 @@
 #include <cstdio>
 
 #include "core/ArrayLock.h"
+#include "ui/terminal/TerminalChartView.h"
 #include "ui/terminal/TerminalPaneView.h"
 #include "ui/terminal/TerminalText.h"
 
@@ -157,7 +158,7 @@ void TerminalFrontEnd::display() {
 }
 
 void TerminalFrontEnd::updateSpinner() {
-    const bool loading = !terminated_ && topPane().isLoading();
+    const bool loading = !terminated_ && (chart_ ? chart_->isLoading() : topPane().isLoading());
     if (loading && spinnerTimer_ == 0) {
         std::weak_ptr<bool> alive = alive_;
         spinnerTimer_ = queue_.repeating(kSpinnerIntervalSeconds, [this, alive] {
@@ -176,7 +177,13 @@ void TerminalFrontEnd::updateSpinner() {
 void TerminalFrontEnd::render(TerminalCanvas& canvas) {
     rows_ = canvas.rows();
     columns_ = canvas.columns();
-    TerminalPaneView::draw(canvas, topPane(), {spinnerFrame_, shell_.allowSaveButton()});
+    if (chart_) {
+        const VelmarModel* model = shell_.model();
+        TerminalChartView::draw(canvas, *chart_, model ? model->history().series(chart_->path()) : nullptr,
+                                model ? model->history().newestTime() : 0.0, {spinnerFrame_, false});
+    } else {
+        TerminalPaneView::draw(canvas, topPane(), {spinnerFrame_, shell_.allowSaveButton()});
+    }
     if (form_) {
         form_->draw(canvas);
     }
@@ -220,7 +227,39 @@ void TerminalFrontEnd::handleKey(const TerminalKey& key) {
         setNeedsDisplay();
         return;
     }
+    if (chart_) {
+        handleChartKey(key);
+        return;
+    }
     handlePaneKey(key);
+}
+
+void TerminalFrontEnd::handleChartKey(const TerminalKey& key) {
+    using Kind = TerminalKey::Kind;
+    if (key.kind == Kind::Escape || key.kind == Kind::Left || key.kind == Kind::Backspace) {
+        popToPane(panes_.size() - 1, true);
+    } else if (key.is(U'+') || key.is(U'=')) {
+        chart_->zoomIn();
+    } else if (key.is(U'-')) {
+        const VelmarModel* model = shell_.model();
+        chart_->zoomOut(model ? model->history().limits().windowSeconds : TerminalChart::kDefaultSpanSeconds);
+    } else if (key.is(U'q') || key.is(U'Q')) {
+        quit();
+    }
+}
+
+void TerminalFrontEnd::openChart() {
+    TerminalPane& pane = topPane();
+    if (!isNumericLeaf(pane.childAt(pane.selectedRow()))) {
+        return;  // only a number has a chart
+    }
+    const auto row = static_cast<std::size_t>(pane.selectedRow());
+    const VelmarModelNodeRef& leaf = pane.node()->childNodes()->at(row);
+    chart_ = std::make_unique<TerminalChart>(joinDisplayPath(pane.path(), leaf->displayName()), leaf);
+    chart_->setChangeObserver([this] { setNeedsDisplay(); });
+    chart_->setStatus(pane.status(), pane.isLoading());
+    shell_.navigationWillShow(*chart_);
+    setNeedsDisplay();
 }
 
 void TerminalFrontEnd::handlePaneKey(const TerminalKey& key) {
@@ -278,7 +317,9 @@ void TerminalFrontEnd::handlePaneKey(const TerminalKey& key) {
         default:
             break;
     }
-    if (key.is(U's') || key.is(U'S')) {
+    if (key.is(U'c') || key.is(U'C')) {
+        openChart();
+    } else if (key.is(U's') || key.is(U'S')) {
         if (shell_.allowSaveButton()) {
             shell_.showSaveView();
         }
@@ -303,11 +344,21 @@ void TerminalFrontEnd::popPane() {
     }
 }
 
+Pane& TerminalFrontEnd::paneAt(std::size_t index) {
+    if (index == panes_.size() && chart_) {
+        return *chart_;
+    }
+    return *panes_.at(index);
+}
+
 void TerminalFrontEnd::popToPane(std::size_t index, bool) {
-    if (index + 1 >= panes_.size()) {
+    if (index + 1 >= paneCount()) {
         return;
     }
-    panes_.resize(index + 1);
+    chart_.reset();
+    if (index + 1 < panes_.size()) {
+        panes_.resize(index + 1);
+    }
     shell_.navigationWillShow(*panes_.back());
     setNeedsDisplay();
 }

@@ -4,10 +4,12 @@
 // Contract: the same shell and panes as the graphical interface: a title line with the pane's title and path,
 // the rows, and a footer with a spinner while loading, the status text and "[s] Save" where the save button
 // is offered. Keys: ↑ ↓ PgUp PgDn Home End move; Enter or → opens an inner row (→ and ← scroll a long
-// selected pair sideways first); ← Backspace or Esc go back; s saves; q quits. The save screen is a modal
-// form; an alert is a box that Enter, Esc or Space closes. Every change schedules one redraw on the main
-// queue and a redraw writes only the lines that changed; a terminal resize redraws everything. The spinner's
-// timer runs only while the top pane is loading. SIGTERM, SIGINT and q run the termination sequence.
+// selected pair sideways first); ← Backspace or Esc go back; c on a value that reads as a number opens its
+// full-screen chart (on top of the stack, live, + and - zoom, Esc ← or Backspace close it); s saves; q
+// quits. The save screen is a modal form; an alert is a box that Enter, Esc or Space closes. Every change
+// schedules one redraw on the main queue and a redraw writes only the lines that changed; a terminal resize
+// redraws everything. The spinner's timer runs only while the top screen is loading. SIGTERM, SIGINT and q
+// run the termination sequence.
 #pragma once
 
 #include <cstdio>
@@ -21,6 +23,7 @@
 #include "ui/SaveScreenPresenter.h"
 #include "ui/VelmarShell.h"
 #include "ui/terminal/CursesScreen.h"
+#include "ui/terminal/TerminalChart.h"
 #include "ui/terminal/TerminalPane.h"
 #include "ui/terminal/TerminalSaveForm.h"
 
@@ -45,8 +48,9 @@ class TerminalFrontEnd : public NavigationStack, public SaveScreenPresenter {
     // Draws the current frame onto a canvas of the given size.
     void render(TerminalCanvas& canvas);
 
-    std::size_t paneCount() const override { return panes_.size(); }
-    Pane& paneAt(std::size_t index) override { return *panes_.at(index); }
+    // The panes, and the chart above them while one is open.
+    std::size_t paneCount() const override { return panes_.size() + (chart_ ? 1 : 0); }
+    Pane& paneAt(std::size_t index) override;
     void popToPane(std::size_t index, bool animated) override;
 
     void presentSaveScreen(VelmarSaveViewController& controller, bool animated) override;
@@ -54,7 +58,9 @@ class TerminalFrontEnd : public NavigationStack, public SaveScreenPresenter {
     void showAlert(const std::string& title, const std::string& message,
                    const std::string& cancelButtonTitle) override;
 
+    // The top pane of the display tree (under the chart, while one is open).
     TerminalPane& topPane() { return *panes_.back(); }
+    TerminalChart* chart() const { return chart_.get(); }
     TerminalSaveForm* saveForm() const { return form_.get(); }
     bool isAlertShown() const { return alert_.has_value(); }
     bool isQuitRequested() const { return quit_; }
@@ -76,6 +82,8 @@ class TerminalFrontEnd : public NavigationStack, public SaveScreenPresenter {
     void display();
     void updateSpinner();
     void handlePaneKey(const TerminalKey& key);
+    void handleChartKey(const TerminalKey& key);
+    void openChart();
     void drawAlert(TerminalCanvas& canvas) const;
     void quit();
 
@@ -83,6 +91,7 @@ class TerminalFrontEnd : public NavigationStack, public SaveScreenPresenter {
     VelmarShell shell_;
     CursesScreen screen_;
     std::vector<std::unique_ptr<TerminalPane>> panes_;
+    std::unique_ptr<TerminalChart> chart_;
     std::unique_ptr<TerminalSaveForm> form_;
     std::optional<Alert> alert_;
     bool displayQueued_ = false;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "core/ValueHistory.h"
 #include "ui/terminal/TerminalText.h"
 
 namespace velmar {
@@ -12,48 +13,6 @@ namespace {
 
 constexpr std::u32string_view kBrailleSpinner = U"⠋⠙⠹⠸⠼⠴⠦⠧⠇⠏";
 constexpr std::u32string_view kAsciiSpinner = U"|/-\\";
-
-// The text, cut to at most `columns` columns; "…" (or "~") replaces what is cut.
-std::u32string elideRight(const std::u32string& text, int columns, bool ascii) {
-    if (TerminalText::width(text, ascii) <= columns) {
-        return text;
-    }
-    if (columns <= 0) {
-        return {};
-    }
-    std::u32string out;
-    int used = 0;
-    for (char32_t ch : text) {
-        const int width = TerminalText::charWidth(ch, ascii);
-        if (used + width > columns - 1) {
-            break;
-        }
-        out.push_back(ch);
-        used += width;
-    }
-    out.push_back(ascii ? U'~' : U'…');
-    return out;
-}
-
-std::u32string elideLeft(const std::u32string& text, int columns, bool ascii) {
-    if (TerminalText::width(text, ascii) <= columns) {
-        return text;
-    }
-    if (columns <= 0) {
-        return {};
-    }
-    std::u32string tail;
-    int used = 0;
-    for (auto it = text.rbegin(); it != text.rend(); ++it) {
-        const int width = TerminalText::charWidth(*it, ascii);
-        if (used + width > columns - 1) {
-            break;
-        }
-        tail.insert(tail.begin(), *it);
-        used += width;
-    }
-    return std::u32string(1, ascii ? U'~' : U'…') + tail;
-}
 
 }  // namespace
 
@@ -106,12 +65,13 @@ void TerminalPaneView::drawTitle(TerminalCanvas& canvas, const TerminalPane& pan
     const std::uint8_t attr = kAttrReverse;
     canvas.fill(0, 0, columns, attr);
     const std::u32string title =
-        elideRight(TerminalText::decodeUtf8(pane.title()), std::max(0, columns - 2), ascii);
+        TerminalText::elideRight(TerminalText::decodeUtf8(pane.title()), std::max(0, columns - 2), ascii);
     const int titleEnd = canvas.put(0, 1, title, attr | kAttrBold, 0, columns);
     // The path takes what the title leaves, cut from the left so that its end (the current pane) stays.
     const int room = columns - titleEnd - 3;
     if (room > 0) {
-        const std::u32string path = elideLeft(TerminalText::decodeUtf8(pane.path()), room, ascii);
+        const std::u32string path =
+            TerminalText::elideLeft(TerminalText::decodeUtf8(pane.path()), room, ascii);
         const int width = TerminalText::width(path, ascii);
         canvas.put(0, columns - 1 - width, path, attr, 0, columns);
     }
@@ -129,7 +89,7 @@ void TerminalPaneView::drawRow(TerminalCanvas& canvas, int line, const VelmarMod
         // Key-only row; the accessory takes the last columns.
         const int content = std::max(0, columns - kAccessoryColumns);
         const CellRect keyFrame = layoutKeyOnlyCell({0, 0, content, 1}, {kw, 1}, kMetrics);
-        const std::u32string shown = elideRight(key, std::max(0, content - keyFrame.x), ascii);
+        const std::u32string shown = TerminalText::elideRight(key, std::max(0, content - keyFrame.x), ascii);
         canvas.put(line, keyFrame.x, shown, base | kAttrBold, 0, content);
         canvas.put(line, columns - kAccessoryColumns, std::u32string(1, ascii ? U'>' : U'›'), base, 0,
                    columns);
@@ -153,21 +113,28 @@ void TerminalPaneView::drawRow(TerminalCanvas& canvas, int line, const VelmarMod
 
 void TerminalPaneView::drawFooter(TerminalCanvas& canvas, const TerminalPane& pane,
                                   const PaneChrome& chrome) {
+    // "[c] Chart" where the cursor is on a value that reads as a number.
+    std::u32string keys = isNumericLeaf(pane.childAt(pane.selectedRow())) ? U"[c] Chart  " : U"";
+    keys += chrome.allowSaveButton ? U"[s] Save  [q] Quit" : U"[q] Quit";
+    drawStatusLine(canvas, pane.status(), pane.isLoading(), chrome.spinnerFrame, keys);
+}
+
+void TerminalPaneView::drawStatusLine(TerminalCanvas& canvas, const std::string& statusText, bool loading,
+                                      int spinner, std::u32string_view keys) {
     const bool ascii = canvas.ascii();
     const int columns = canvas.columns();
     const int line = canvas.rows() - 1;
     const std::uint8_t attr = kAttrReverse;
     canvas.fill(line, 0, columns, attr);
-    const std::u32string keys = chrome.allowSaveButton ? U"[s] Save  [q] Quit" : U"[q] Quit";
     const int keysWidth = TerminalText::width(keys, ascii);
-    const std::u32string status = TerminalText::decodeUtf8(pane.status());
+    const std::u32string status = TerminalText::decodeUtf8(statusText);
     // The status comes first: the keys are shown only where both fit.
     const bool showKeys = 3 + TerminalText::width(status, ascii) + 2 + keysWidth + 1 <= columns;
     const int statusRoom = columns - 3 - (showKeys ? keysWidth + 2 : 0) - 1;
-    if (pane.isLoading()) {
-        canvas.put(line, 1, spinnerFrame(chrome.spinnerFrame, ascii), attr, 0, columns);
+    if (loading) {
+        canvas.put(line, 1, spinnerFrame(spinner, ascii), attr, 0, columns);
     }
-    canvas.put(line, 3, elideRight(status, std::max(0, statusRoom), ascii), attr, 0, columns);
+    canvas.put(line, 3, TerminalText::elideRight(status, std::max(0, statusRoom), ascii), attr, 0, columns);
     if (showKeys) {
         canvas.put(line, columns - 1 - keysWidth, keys, attr, 0, columns);
     }

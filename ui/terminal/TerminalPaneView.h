@@ -1,6 +1,6 @@
 // TerminalPaneView: draws a pane on the terminal canvas: the title line (the pane's title on the left, its
 // path on the right), one line per child and the footer (a spinner while loading, the status text, and the
-// keys of the actions on offer).
+// keys of the actions on offer: "[c] Chart" while the cursor is on a value that reads as a number).
 //
 // Contract: rows follow the CellLayout rules in columns (margin 1, gap 2): a leaf's value sits flush against
 // the right edge when the pair fits and follows the key when it does not; then the row can be scrolled
@@ -34,6 +34,9 @@ class TerminalPaneView {
     static std::u32string spinnerFrame(int frame, bool ascii);
 
     static void draw(TerminalCanvas& canvas, TerminalPane& pane, const PaneChrome& chrome);
+    // The last line: a spinner while loading, the status, and the keys on the right where both fit.
+    static void drawStatusLine(TerminalCanvas& canvas, const std::string& status, bool loading, int spinner,
+                               std::u32string_view keys);
 
   private:
     static void drawTitle(TerminalCanvas& canvas, const TerminalPane& pane);

@@ -116,4 +116,45 @@ int TerminalText::width(std::u32string_view text, bool ascii) {
     return total;
 }
 
+std::u32string TerminalText::elideRight(const std::u32string& text, int columns, bool ascii) {
+    if (width(text, ascii) <= columns) {
+        return text;
+    }
+    if (columns <= 0) {
+        return {};
+    }
+    std::u32string out;
+    int used = 0;
+    for (char32_t ch : text) {
+        const int columnsOfCh = charWidth(ch, ascii);
+        if (used + columnsOfCh > columns - 1) {
+            break;
+        }
+        out.push_back(ch);
+        used += columnsOfCh;
+    }
+    out.push_back(ascii ? U'~' : U'…');
+    return out;
+}
+
+std::u32string TerminalText::elideLeft(const std::u32string& text, int columns, bool ascii) {
+    if (width(text, ascii) <= columns) {
+        return text;
+    }
+    if (columns <= 0) {
+        return {};
+    }
+    std::u32string tail;
+    int used = 0;
+    for (auto it = text.rbegin(); it != text.rend(); ++it) {
+        const int columnsOfCh = charWidth(*it, ascii);
+        if (used + columnsOfCh > columns - 1) {
+            break;
+        }
+        tail.insert(tail.begin(), *it);
+        used += columnsOfCh;
+    }
+    return std::u32string(1, ascii ? U'~' : U'…') + tail;
+}
+
 }  // namespace velmar

@@ -21,6 +21,10 @@ struct TerminalText {
     static char32_t displayed(char32_t ch, bool ascii);
     static int width(std::u32string_view text, bool ascii);
     static int width(std::string_view utf8, bool ascii) { return width(decodeUtf8(utf8), ascii); }
+    // The text cut to at most `columns` columns; "…" (or "~") replaces what is cut, at the end or at the
+    // start.
+    static std::u32string elideRight(const std::u32string& text, int columns, bool ascii);
+    static std::u32string elideLeft(const std::u32string& text, int columns, bool ascii);
 };
 
 }  // namespace velmar
