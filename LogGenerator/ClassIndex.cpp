@@ -1,11 +1,19 @@
 #include "LogGenerator/ClassIndex.h"
 
+#include <charconv>
 #include <cstdio>
 
 #include "LogGenerator/LogCodeKey.h"
 #include "core/platform/SystemLog.h"
 
 namespace velmar {
+
+ClassIndex::ClassIndex(std::span<const DecoderRow> rows) {
+    decoders_.reserve(rows.size());
+    for (const DecoderRow& row : rows) {
+        decoders_.push_back({&row, row.create(classDict, codeDictionary)});
+    }
+}
 
 ClassIndex::~ClassIndex() {
     std::fputs("Deallocing ClassIndex\n", stdout);
@@ -35,6 +43,39 @@ std::vector<std::string> ClassIndex::getAllLogCodes() const {
         codes.push_back(entry.first);
     }
     return codes;
+}
+
+std::vector<ClassIndex::Subscription> ClassIndex::subscriptions() const {
+    const auto rowOfDecoder = [this](const Base* decoder) -> const DecoderRow* {
+        for (const CreatedDecoder& created : decoders_) {
+            if (created.decoder.get() == decoder) {
+                return created.row;
+            }
+        }
+        return nullptr;
+    };
+    std::vector<Subscription> map;
+    for (const auto& [key, subscribers] : codeDictionary) {
+        std::int32_t code = 0;
+        std::from_chars(key.data(), key.data() + key.size(), code);
+        for (const DecoderRef& decoder : subscribers) {
+            if (const DecoderRow* row = rowOfDecoder(decoder.get())) {
+                map.push_back({code, row});
+            }
+        }
+    }
+    for (const CreatedDecoder& created : decoders_) {
+        if (created.row->codes.codes().empty()) {
+            map.push_back({std::nullopt, created.row});
+        }
+    }
+    return map;
+}
+
+void ClassIndex::releaseDecoders() {
+    for (CreatedDecoder& created : decoders_) {
+        created.decoder.reset();
+    }
 }
 
 }  // namespace velmar

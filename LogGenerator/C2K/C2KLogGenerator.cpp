@@ -1,9 +1,9 @@
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 
+#include <iterator>
 #include <unordered_set>
 
 #include "LogGenerator/C2K/C2KDisplaySetter.h"
-#include "LogGenerator/C2K/C2KLogCodes.h"
 #include "LogGenerator/C2K/C2KLogParsers.h"
 #include "LogGenerator/C2K/C2KSortedPilots.h"
 #include "LogGenerator/C2K/C2KStateKeys.h"
@@ -172,9 +172,9 @@ PlistValue C2KLogGenerator::generateLogUsingState(const StateDict& state) {
 
 PlistValue C2KLogGenerator::getStartCommand() {
     auto codes = PlistArray::create();
-    codes->reserve(c2k::kStartCommandCodes.size());
-    for (const std::int32_t code : c2k::kStartCommandCodes) {
-        codes->append(PlistValue::integer(code));
+    codes->reserve(std::size(c2k::kParsers));
+    for (const c2k::C2KParserRow& row : c2k::kParsers) {
+        codes->append(PlistValue::integer(row.code));
     }
     auto command = PlistDictionary::create();
     command->set(kKxSetStateKey, kKxStreamingState);

@@ -8,7 +8,7 @@ namespace velmar {
 
 class ActiveSet : public CellSetDecoder {
   public:
-    ActiveSet() : CellSetDecoder("ActiveSet", "Active Set", true) {}
+    ActiveSet();
 };
 
 }  // namespace velmar

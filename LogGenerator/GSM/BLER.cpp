@@ -2,13 +2,15 @@
 
 #include "LogGenerator/GSM/CountedList.h"
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
 constexpr gsm::RecordRule kRules[] = {
-    {0x4116, 16},
+    {kLogCodeUmtsBlockErrors, 16},
 };
 
 constexpr RecordField kWindowFields[] = {
@@ -28,6 +30,8 @@ constexpr std::size_t kEntryLength = 9;
 
 }  // namespace
 
+BLER::BLER() : TableDecoder(rowOf<BLER>(kGsmDecoders)) {}
+
 void BLER::updateWithData(ByteView data, std::int32_t logCode) {
     if (gsm::admitRecord("BLER", kRules, data, logCode) == nullptr) {
         return;
@@ -46,14 +50,6 @@ void BLER::updateWithData(ByteView data, std::int32_t logCode) {
         rows->append(rowFromFields(kTransportChannelFields, record, channels.elementOffset(i)));
     }
     section->set("Transport Channels", std::move(rows));
-}
-
-std::string_view BLER::getSectionName() const {
-    return "BLER";
-}
-
-LogCodeArray BLER::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

@@ -6,15 +6,14 @@
 // entries past the end read as zeros.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class BLER : public Base {
+class BLER : public TableDecoder {
   public:
+    BLER();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

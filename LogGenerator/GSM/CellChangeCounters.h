@@ -8,7 +8,7 @@ namespace velmar {
 
 class CellChangeCounters : public PlaceholderDecoder {
   public:
-    CellChangeCounters() : PlaceholderDecoder("CellChangeCounters", "Cell Change Counters") {}
+    CellChangeCounters();
 };
 
 }  // namespace velmar

@@ -2,8 +2,9 @@
 
 #include "LogGenerator/GSM/CellSetRecord.h"
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
-#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/RecordFields.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -35,7 +36,7 @@ PlistDictionaryRef activeCellRow(const CellSetRecord& record, std::size_t index,
 }  // namespace
 
 void CellSetDecoder::updateWithData(ByteView data, std::int32_t logCode) {
-    if (gsm::admitRecord(title_, kRules, data, logCode) == nullptr) {
+    if (gsm::admitRecord(row().decoder, kRules, data, logCode) == nullptr) {
         return;
     }
     const PlistArrayRef section = sectionArray();
@@ -54,8 +55,9 @@ void CellSetDecoder::updateWithData(ByteView data, std::int32_t logCode) {
     replaceArray(section, rows);
 }
 
-LogCodeArray CellSetDecoder::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
-}
+ActiveSet::ActiveSet() : CellSetDecoder(rowOf<ActiveSet>(kGsmDecoders), true) {}
+DetectedSet::DetectedSet() : CellSetDecoder(rowOf<DetectedSet>(kGsmDecoders), false) {}
+MonitoredSet::MonitoredSet() : CellSetDecoder(rowOf<MonitoredSet>(kGsmDecoders), false) {}
+VirtualActiveSet::VirtualActiveSet() : CellSetDecoder(rowOf<VirtualActiveSet>(kGsmDecoders), false) {}
 
 }  // namespace velmar

@@ -8,25 +8,20 @@
 // how the baseband's sets are shown and it is kept.
 #pragma once
 
-#include <string_view>
-
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class CellSetDecoder : public Base {
+class CellSetDecoder : public TableDecoder {
   public:
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override { return sectionName_; }
-    LogCodeArray getLogCodeArray() const override;
 
   protected:
-    CellSetDecoder(const char* title, std::string_view sectionName, bool listsActiveCells)
-        : title_(title), sectionName_(sectionName), listsActiveCells_(listsActiveCells) {}
+    // Each call logs the decoder's class name.
+    CellSetDecoder(const DecoderRow& row, bool listsActiveCells)
+        : TableDecoder(row), listsActiveCells_(listsActiveCells) {}
 
   private:
-    const char* title_;
-    std::string_view sectionName_;
     bool listsActiveCells_;
 };
 

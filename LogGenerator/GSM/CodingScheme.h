@@ -8,7 +8,7 @@ namespace velmar {
 
 class CodingScheme : public PlaceholderDecoder {
   public:
-    CodingScheme() : PlaceholderDecoder("CodingScheme", "Coding Scheme") {}
+    CodingScheme();
 };
 
 }  // namespace velmar

@@ -8,7 +8,7 @@ namespace velmar {
 
 class DetectedSet : public CellSetDecoder {
   public:
-    DetectedSet() : CellSetDecoder("DetectedSet", "Detected Set", false) {}
+    DetectedSet();
 };
 
 }  // namespace velmar

@@ -1,16 +1,18 @@
 #include "LogGenerator/GSM/EquivalentPLMNList.h"
 
 #include <optional>
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "core/platform/StringFormat.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
 constexpr gsm::RecordRule kRules[] = {
-    {0x7150, 17},
+    {kLogCodeEquivalentPlmns, 17},
 };
 
 constexpr std::size_t kCountOffset = 16;
@@ -41,6 +43,8 @@ PlistDictionaryRef plmnRow(const RecordReader& record, std::size_t at) {
 
 }  // namespace
 
+EquivalentPLMNList::EquivalentPLMNList() : TableDecoder(rowOf<EquivalentPLMNList>(kGsmDecoders)) {}
+
 void EquivalentPLMNList::updateWithData(ByteView data, std::int32_t logCode) {
     if (gsm::admitRecord("Equivalent PLMN List", kRules, data, logCode) == nullptr) {
         return;
@@ -58,14 +62,6 @@ void EquivalentPLMNList::updateWithData(ByteView data, std::int32_t logCode) {
         rows->append(plmnRow(record, *at));
     }
     replaceArray(section, rows);
-}
-
-std::string_view EquivalentPLMNList::getSectionName() const {
-    return "Equivalent PLMN List";
-}
-
-LogCodeArray EquivalentPLMNList::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

@@ -1,6 +1,8 @@
 #include "LogGenerator/GSM/GPRSInformation.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -86,25 +88,23 @@ constexpr RecordField kHysteresisFields[] = {
 };
 
 constexpr gsm::RecordRule kRules[] = {
-    {0x51F5, 18, kCellOptionFields}, {0x7135, 32, kRegistrationFields},     {0x51F6, 24, kTbfFields},
-    {0x51FB, 34, kPbcchFields},      {0x51FD, 35, kPacketSystemInfoFields}, {0x51F4, 15, kSi13Fields},
-    {0x5137, 29, kHysteresisFields},
+    {kLogCodeGprsCellOptions, 18, kCellOptionFields},
+    {kLogCodeRegistrationInfo, 32, kRegistrationFields},
+    {kLogCodeGprsTbfParameters, 24, kTbfFields},
+    {kLogCodeGprsPbcchDescription, 34, kPbcchFields},
+    {kLogCodeGprsPacketSystemInfo, 35, kPacketSystemInfoFields},
+    {kLogCodeGprsSi13Position, 15, kSi13Fields},
+    {kLogCodeGsmMeasurements, 29, kHysteresisFields},
 };
 
 }  // namespace
+
+GPRSInformation::GPRSInformation() : TableDecoder(rowOf<GPRSInformation>(kGsmDecoders)) {}
 
 void GPRSInformation::updateWithData(ByteView data, std::int32_t logCode) {
     if (const gsm::RecordRule* rule = gsm::admitRecord("GPRSInformation", kRules, data, logCode)) {
         gsm::writeRuleFields(*rule, data, sectionDictionary().get());
     }
-}
-
-std::string_view GPRSInformation::getSectionName() const {
-    return "GPRS Information";
-}
-
-LogCodeArray GPRSInformation::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

@@ -7,15 +7,14 @@
 // nothing.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class GPRSInformation : public Base {
+class GPRSInformation : public TableDecoder {
   public:
+    GPRSInformation();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

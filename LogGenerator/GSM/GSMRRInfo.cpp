@@ -1,6 +1,8 @@
 #include "LogGenerator/GSM/GSMRRInfo.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -66,26 +68,20 @@ constexpr RecordField kDrxFields[] = {
 };
 
 constexpr gsm::RecordRule kRules[] = {
-    {0x512C, 17, kRrStateFields},
-    {0x5137, 29, kServingMeasurementFields},
-    {0x5072, 20, kChannelFields},
-    {0x51F6, 24, kDrxFields},
+    {kLogCodeGsmRrState, 17, kRrStateFields},
+    {kLogCodeGsmMeasurements, 29, kServingMeasurementFields},
+    {kLogCodeGsmChannelParameters, 20, kChannelFields},
+    {kLogCodeGprsTbfParameters, 24, kDrxFields},
 };
 
 }  // namespace
+
+GSMRRInfo::GSMRRInfo() : TableDecoder(rowOf<GSMRRInfo>(kGsmDecoders)) {}
 
 void GSMRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
     if (const gsm::RecordRule* rule = gsm::admitRecord("GSMRRInfo", kRules, data, logCode)) {
         gsm::writeRuleFields(*rule, data, sectionDictionary().get());
     }
-}
-
-std::string_view GSMRRInfo::getSectionName() const {
-    return "GSM RR Info";
-}
-
-LogCodeArray GSMRRInfo::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

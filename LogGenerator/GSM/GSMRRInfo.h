@@ -5,15 +5,14 @@
 // message: %d"; records shorter than their code's minimum change nothing.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class GSMRRInfo : public Base {
+class GSMRRInfo : public TableDecoder {
   public:
+    GSMRRInfo();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

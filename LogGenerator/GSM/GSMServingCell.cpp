@@ -1,8 +1,9 @@
 #include "LogGenerator/GSM/GSMServingCell.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
-#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "core/platform/KxServerProtocol.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -33,7 +34,7 @@ constexpr RecordRule kRules[] = {
     {kLogCodeGsmServingIdentity, 26, kIdentityFields},
     {kLogCodeGsmMeasurements, 29, kMeasurementFields},
     {kLogCodeGsmDedicatedChannel, 17, kDedicatedChannelFields},
-    {gsm::kCellMonitorCode, 0},
+    {kLogCodeCellMonitor, 0},
 };
 
 void showServingCell(ByteView data, PlistDictionary* section) {
@@ -50,25 +51,19 @@ void showServingCell(ByteView data, PlistDictionary* section) {
 
 }  // namespace
 
+GSMServingCell::GSMServingCell() : TableDecoder(rowOf<GSMServingCell>(kGsmDecoders)) {}
+
 void GSMServingCell::updateWithData(ByteView data, std::int32_t logCode) {
     const RecordRule* rule = gsm::admitRecord("GSMServingCell", kRules, data, logCode);
     if (rule == nullptr) {
         return;
     }
     const PlistDictionaryRef section = sectionDictionary();
-    if (rule->code == gsm::kCellMonitorCode) {
+    if (rule->code == kLogCodeCellMonitor) {
         showServingCell(data, section.get());
     } else {
         gsm::writeRuleFields(*rule, data, section.get());
     }
-}
-
-std::string_view GSMServingCell::getSectionName() const {
-    return "GSM Serving Cell";
-}
-
-LogCodeArray GSMServingCell::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

@@ -2,15 +2,14 @@
 // channel's ARFCN (0x5076) and the GSM serving cell of the cell-monitor record (0xFF0001).
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class GSMServingCell : public Base {
+class GSMServingCell : public TableDecoder {
   public:
+    GSMServingCell();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

@@ -1,8 +1,9 @@
 #include "LogGenerator/GSM/GSMSet.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
-#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/GSM/RecordRows.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -23,19 +24,13 @@ constexpr RecordRowList kGsmCells{14, 15, 7, kGsmCellFields};
 
 }  // namespace
 
+GSMSet::GSMSet() : TableDecoder(rowOf<GSMSet>(kGsmDecoders)) {}
+
 void GSMSet::updateWithData(ByteView data, std::int32_t logCode) {
     if (gsm::admitRecord("GSMSet", kRules, data, logCode) == nullptr) {
         return;
     }
     showRecordRows(kGsmCells, RecordReader(data), sectionArray());
-}
-
-std::string_view GSMSet::getSectionName() const {
-    return "GSM Set";
-}
-
-LogCodeArray GSMSet::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

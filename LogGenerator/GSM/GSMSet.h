@@ -5,15 +5,14 @@
 // record; the two views deliberately share that offset.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class GSMSet : public Base {
+class GSMSet : public TableDecoder {
   public:
+    GSMSet();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

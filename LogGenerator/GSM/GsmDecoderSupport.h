@@ -21,9 +21,6 @@
 
 namespace velmar::gsm {
 
-// The extra code of the cell-monitor array that the telephony service supplies.
-inline constexpr std::int32_t kCellMonitorCode = 0xFF0001;
-
 // One log code that a decoder handles.
 struct RecordRule {
     std::int32_t code;

@@ -2,14 +2,15 @@
 
 #include "LogGenerator/GSM/CountedList.h"
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr std::int32_t kHsdpaCode = 0x4221;
 constexpr gsm::RecordRule kRules[] = {
-    {kHsdpaCode, 18},
+    {kLogCodeUmtsHsdpa, 18},
 };
 
 constexpr ValueName kCarrierRows[] = {
@@ -54,6 +55,8 @@ PlistArrayRef harqProcessRows(const RecordReader& record, const CountedList& lis
 
 }  // namespace
 
+HSDPAInformation::HSDPAInformation() : TableDecoder(rowOf<HSDPAInformation>(kGsmDecoders)) {}
+
 void HSDPAInformation::updateWithData(ByteView data, std::int32_t logCode) {
     gsm::logDecoderEntry("HSDPA Info");
     // Unlike the other decoders, an unexpected code is ignored without a message.
@@ -79,14 +82,6 @@ void HSDPAInformation::updateWithData(ByteView data, std::int32_t logCode) {
     if (secondary.count > 0) {
         section->set("Secondary HARQ Process", harqProcessRows(record, secondary));
     }
-}
-
-std::string_view HSDPAInformation::getSectionName() const {
-    return "HSDPA Info";
-}
-
-LogCodeArray HSDPAInformation::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

@@ -6,15 +6,14 @@
 // checked against the record's length: entries past the end read as zeros.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class HSDPAInformation : public Base {
+class HSDPAInformation : public TableDecoder {
   public:
+    HSDPAInformation();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

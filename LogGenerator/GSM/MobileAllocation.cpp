@@ -2,8 +2,9 @@
 
 #include "LogGenerator/GSM/CountedList.h"
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
-#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/RecordFields.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -25,6 +26,8 @@ constexpr RecordField kArfcn = u16Field(0, "ARFCN");
 
 }  // namespace
 
+MobileAllocation::MobileAllocation() : TableDecoder(rowOf<MobileAllocation>(kGsmDecoders)) {}
+
 void MobileAllocation::updateWithData(ByteView data, std::int32_t logCode) {
     if (gsm::admitRecord("MobileAllocation", kRules, data, logCode) == nullptr) {
         return;
@@ -40,14 +43,6 @@ void MobileAllocation::updateWithData(ByteView data, std::int32_t logCode) {
         writeFields(kAllocationFields, record, 0, *section);
         section->set("ARFCNs", std::move(arfcns));
     }
-}
-
-std::string_view MobileAllocation::getSectionName() const {
-    return "Mobile Allocation";
-}
-
-LogCodeArray MobileAllocation::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

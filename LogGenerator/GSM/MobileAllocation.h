@@ -5,15 +5,14 @@
 // without the array lock, as key sections are.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class MobileAllocation : public Base {
+class MobileAllocation : public TableDecoder {
   public:
+    MobileAllocation();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

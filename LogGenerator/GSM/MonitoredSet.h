@@ -8,7 +8,7 @@ namespace velmar {
 
 class MonitoredSet : public CellSetDecoder {
   public:
-    MonitoredSet() : CellSetDecoder("MonitoredSet", "Monitored Set", false) {}
+    MonitoredSet();
 };
 
 }  // namespace velmar

@@ -1,12 +1,13 @@
 #include "LogGenerator/GSM/NeighboringCells.h"
 
 #include <iterator>
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 
 #include "LogGenerator/GSM/CellMonitorWalk.h"
 #include "LogGenerator/GSM/CountedList.h"
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
-#include "LogGenerator/GSM/GsmLogCodes.h"
 #include "core/platform/KxServerProtocol.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -15,7 +16,7 @@ namespace {
 constexpr gsm::RecordRule kRules[] = {
     {kLogCodeGsmMeasurements, 29},
     {kLogCodeGsmBsicList, 15},
-    {gsm::kCellMonitorCode, 0},
+    {kLogCodeCellMonitor, 0},
 };
 
 // 0x51FF: count at 14, 4-byte elements from 15: ARFCN (2 bytes), BSIC (1 byte), one unused byte.
@@ -43,6 +44,8 @@ constexpr NeighbourCellField kNeighbourCellFields[] = {
 
 }  // namespace
 
+NeighboringCells::NeighboringCells() : TableDecoder(rowOf<NeighboringCells>(kGsmDecoders)) {}
+
 void NeighboringCells::updateWithData(ByteView data, std::int32_t logCode) {
     const gsm::RecordRule* rule = gsm::admitRecord("NeighboringCells", kRules, data, logCode);
     if (rule == nullptr) {
@@ -55,7 +58,7 @@ void NeighboringCells::updateWithData(ByteView data, std::int32_t logCode) {
         case kLogCodeGsmMeasurements:
             updateNeighbourMeasurements(data);
             break;
-        case gsm::kCellMonitorCode:
+        case kLogCodeCellMonitor:
             showNeighbourCells(data, kKxCellMonitorRadioAccessTechnologyGSM, kNeighbourCellFields,
                                sectionArray());
             break;
@@ -97,14 +100,6 @@ void NeighboringCells::updateNeighbourMeasurements(ByteView data) {
         rows->append(std::move(row));
     }
     replaceArray(section, rows);
-}
-
-std::string_view NeighboringCells::getSectionName() const {
-    return "Neighboring Cells";
-}
-
-LogCodeArray NeighboringCells::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

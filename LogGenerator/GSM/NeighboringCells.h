@@ -10,15 +10,14 @@
 #include <string>
 #include <unordered_map>
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class NeighboringCells : public Base {
+class NeighboringCells : public TableDecoder {
   public:
+    NeighboringCells();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 
   private:
     void updateBsicList(ByteView data);

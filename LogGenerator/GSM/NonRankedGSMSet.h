@@ -7,7 +7,7 @@ namespace velmar {
 
 class NonRankedGSMSet : public PlaceholderDecoder {
   public:
-    NonRankedGSMSet() : PlaceholderDecoder("NonRankedGSMSet", "Non-Ranked GSM Set") {}
+    NonRankedGSMSet();
 };
 
 }  // namespace velmar

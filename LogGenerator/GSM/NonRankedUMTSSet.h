@@ -7,7 +7,7 @@ namespace velmar {
 
 class NonRankedUMTSSet : public PlaceholderDecoder {
   public:
-    NonRankedUMTSSet() : PlaceholderDecoder("NonRankedUMTSSet", "Non-Ranked UMTS Set") {}
+    NonRankedUMTSSet();
 };
 
 }  // namespace velmar

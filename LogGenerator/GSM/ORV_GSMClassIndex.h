@@ -1,17 +1,16 @@
-// ORV_GSMClassIndex: the class index of the GSM/UMTS technology of the log-code family. It creates, once, the
-// twenty-six GSM/UMTS record decoders, each of which registers itself in classDict and codeDictionary, and
-// releases them again.
+// ORV_GSMClassIndex: the class index of the GSM/UMTS technology of the log-code family: its twenty-six record
+// decoders and the log codes they subscribe to.
 //
-// Contract: the decoders are created strictly in the order below, which is the order in which dispatch calls
-// the subscribers of a shared code (0x417A: ActiveSet, DetectedSet, MonitoredSet, VirtualActiveSet; 0xFF0001:
-// GSMServingCell, NeighboringCells, ServingPLMN, UMTSSet, UMTSRRInfo). Destruction writes "Deallocing
-// ORV_GSMClassIndex" to standard output, releases the references in declaration order, and then the base
-// writes "Deallocing ClassIndex".
+// Contract: kGsmDecoders below is the table from which the index creates its decoders, strictly in its order,
+// which is the order in which dispatch calls the subscribers of a shared code (0x417A: ActiveSet,
+// DetectedSet, MonitoredSet, VirtualActiveSet; 0xFF0001: GSMServingCell, NeighboringCells, ServingPLMN,
+// UMTSSet, UMTSRRInfo). The five placeholders subscribe to no code. Destruction writes "Deallocing
+// ORV_GSMClassIndex" to standard output, releases the decoders in creation order, and then the base writes
+// "Deallocing ClassIndex".
 #pragma once
 
-#include <memory>
-
 #include "LogGenerator/ClassIndex.h"
+#include "LogGenerator/DecoderTable.h"
 #include "LogGenerator/GSM/ActiveSet.h"
 #include "LogGenerator/GSM/BLER.h"
 #include "LogGenerator/GSM/CellChangeCounters.h"
@@ -38,41 +37,50 @@
 #include "LogGenerator/GSM/UMTSRRMeasurement.h"
 #include "LogGenerator/GSM/UMTSSet.h"
 #include "LogGenerator/GSM/VirtualActiveSet.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
+inline constexpr DecoderRow kGsmDecoders[] = {
+    VELMAR_DECODER_ROW(ActiveSet, "Active Set", kLogCodeUmtsCellSets),
+    VELMAR_DECODER_ROW(CodingScheme, "Coding Scheme"),
+    VELMAR_DECODER_ROW(GPRSInformation, "GPRS Information", kLogCodeGprsCellOptions, kLogCodeRegistrationInfo,
+                       kLogCodeGprsTbfParameters, kLogCodeGprsPbcchDescription, kLogCodeGprsPacketSystemInfo,
+                       kLogCodeGprsSi13Position, kLogCodeGsmMeasurements),
+    VELMAR_DECODER_ROW(GSMServingCell, "GSM Serving Cell", kLogCodeGsmServingIdentity,
+                       kLogCodeGsmMeasurements, kLogCodeGsmDedicatedChannel, kLogCodeCellMonitor),
+    VELMAR_DECODER_ROW(MobileAllocation, "Mobile Allocation", kLogCodeGsmMobileAllocation),
+    VELMAR_DECODER_ROW(NeighboringCells, "Neighboring Cells", kLogCodeGsmMeasurements, kLogCodeGsmBsicList,
+                       kLogCodeCellMonitor),
+    kPDPContextListRow,
+    VELMAR_DECODER_ROW(ProcessPS, "Process PS", kLogCodeGmmState, kLogCodeRegistrationState),
+    VELMAR_DECODER_ROW(UMTSRRMeasurement, "UMTS RR Measurement"),
+    VELMAR_DECODER_ROW(CellChangeCounters, "Cell Change Counters"),
+    VELMAR_DECODER_ROW(DetectedSet, "Detected Set", kLogCodeUmtsCellSets),
+    VELMAR_DECODER_ROW(GSMSet, "GSM Set", kLogCodeUmtsIdleMeasurements),
+    VELMAR_DECODER_ROW(NonRankedGSMSet, "Non-Ranked GSM Set"),
+    VELMAR_DECODER_ROW(ProcessCO, "Process CO", kLogCodeMmState, kLogCodeRegistrationState),
+    VELMAR_DECODER_ROW(ServingPLMN, "Serving PLMN", kLogCodeRegistrationInfo, kLogCodeRegistrationState,
+                       kLogCodeCellMonitor),
+    VELMAR_DECODER_ROW(UMTSSet, "UMTS Set", kLogCodeUmtsIdleMeasurements, kLogCodeCellMonitor),
+    VELMAR_DECODER_ROW(EquivalentPLMNList, "Equivalent PLMN List", kLogCodeEquivalentPlmns),
+    VELMAR_DECODER_ROW(GSMRRInfo, "GSM RR Info", kLogCodeGsmRrState, kLogCodeGsmMeasurements,
+                       kLogCodeGsmChannelParameters, kLogCodeGprsTbfParameters),
+    VELMAR_DECODER_ROW(MonitoredSet, "Monitored Set", kLogCodeUmtsCellSets),
+    VELMAR_DECODER_ROW(NonRankedUMTSSet, "Non-Ranked UMTS Set"),
+    VELMAR_DECODER_ROW(ProcessCS, "Process CS", kLogCodeMmState, kLogCodeRegistrationState),
+    VELMAR_DECODER_ROW(UMTSRRInfo, "UMTS RR Info", kLogCodeUmtsRrcState, kLogCodeUmtsTransmitPower,
+                       kLogCodeUmtsCellIdentity, kLogCodeUmtsCiphering, kLogCodeCellMonitor),
+    VELMAR_DECODER_ROW(BLER, "BLER", kLogCodeUmtsBlockErrors),
+    VELMAR_DECODER_ROW(VirtualActiveSet, "Virtual Active Set", kLogCodeUmtsCellSets),
+    kSimInfoRow,
+    VELMAR_DECODER_ROW(HSDPAInformation, "HSDPA Info", kLogCodeUmtsHsdpa),
+};
+
 class ORV_GSMClassIndex : public ClassIndex {
   public:
-    ORV_GSMClassIndex();
+    ORV_GSMClassIndex() : ClassIndex(kGsmDecoders) {}
     ~ORV_GSMClassIndex() override;
-
-  private:
-    std::shared_ptr<ActiveSet> objActiveSet;
-    std::shared_ptr<CodingScheme> objCodingScheme;
-    std::shared_ptr<GPRSInformation> objGPRSInformation;
-    std::shared_ptr<GSMServingCell> objGSMServingCell;
-    std::shared_ptr<MobileAllocation> objMobileAllocation;
-    std::shared_ptr<NeighboringCells> objNeighboringCells;
-    std::shared_ptr<PDPContextList> objPDPContextList;
-    std::shared_ptr<ProcessPS> objProcessPS;
-    std::shared_ptr<UMTSRRMeasurement> objUMTSRRMeasurement;
-    std::shared_ptr<CellChangeCounters> objCellChangeCounter;
-    std::shared_ptr<DetectedSet> objDetectedSet;
-    std::shared_ptr<GSMSet> objGSMSet;
-    std::shared_ptr<NonRankedGSMSet> objNonRankedGSMSet;
-    std::shared_ptr<ProcessCO> objProcessCO;
-    std::shared_ptr<ServingPLMN> objServingPLMN;
-    std::shared_ptr<UMTSSet> objUMTSSet;
-    std::shared_ptr<EquivalentPLMNList> objEquivalentPLMNList;
-    std::shared_ptr<GSMRRInfo> objGSMRRInfo;
-    std::shared_ptr<MonitoredSet> objMonitoredSet;
-    std::shared_ptr<NonRankedUMTSSet> objNonRankedUMTSSet;
-    std::shared_ptr<ProcessCS> objProcessCS;
-    std::shared_ptr<UMTSRRInfo> objUMTSRRInfo;
-    std::shared_ptr<BLER> objBLER;
-    std::shared_ptr<VirtualActiveSet> objVirtualActiveSet;
-    std::shared_ptr<SimInfo> objSimInfo;
-    std::shared_ptr<HSDPAInformation> objHSDPAInformation;
 };
 
 }  // namespace velmar

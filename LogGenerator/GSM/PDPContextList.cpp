@@ -1,7 +1,6 @@
 #include "LogGenerator/GSM/PDPContextList.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
-#include "LogGenerator/GSM/GsmLogCodes.h"
 #include "core/platform/plist/PlistCodec.h"
 
 namespace velmar {
@@ -20,19 +19,13 @@ PlistArrayRef parseContexts(ByteView record) {
 
 }  // namespace
 
+PDPContextList::PDPContextList() : TableDecoder(kPDPContextListRow) {}
+
 void PDPContextList::updateWithData(ByteView data, std::int32_t) {
     gsm::logDecoderEntry("PDPContextList");
     if (const PlistArrayRef contexts = parseContexts(data)) {
         replaceArray(sectionArray(), contexts);
     }
-}
-
-std::string_view PDPContextList::getSectionName() const {
-    return "PDP Context Info";
-}
-
-LogCodeArray PDPContextList::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCodePdpContexts};
 }
 
 }  // namespace velmar

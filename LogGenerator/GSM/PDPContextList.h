@@ -6,15 +6,19 @@
 // are; anything else (another root, unparsable data) leaves the rows unchanged, silently.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
+#include "core/platform/logcodes/ExtraLogCodes.h"
 
 namespace velmar {
 
-class PDPContextList : public Base {
+class PDPContextList : public TableDecoder {
   public:
+    PDPContextList();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
+
+// The row of every technology's decoder table.
+inline constexpr DecoderRow kPDPContextListRow =
+    VELMAR_DECODER_ROW(PDPContextList, "PDP Context Info", kLogCodePdpContexts);
 
 }  // namespace velmar

@@ -2,6 +2,8 @@
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/MobilityStateNames.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -13,25 +15,19 @@ constexpr RecordField kMmFields[] = {
 };
 
 constexpr gsm::RecordRule kRules[] = {
-    {0x7131, kMobilityRecordMinimumLength, kMmFields},
-    {0x7132, kMobilityRecordMinimumLength, kRegistrationStateFields},
+    {kLogCodeMmState, kMobilityRecordMinimumLength, kMmFields},
+    {kLogCodeRegistrationState, kMobilityRecordMinimumLength, kRegistrationStateFields},
 };
 
 }  // namespace
+
+ProcessCO::ProcessCO() : TableDecoder(rowOf<ProcessCO>(kGsmDecoders)) {}
 
 void ProcessCO::updateWithData(ByteView data, std::int32_t logCode) {
     // The common view logs the circuit-switched decoder's title, "ProcessCS", as its own.
     if (const gsm::RecordRule* rule = gsm::admitRecord("ProcessCS", kRules, data, logCode)) {
         gsm::writeRuleFields(*rule, data, sectionDictionary().get());
     }
-}
-
-std::string_view ProcessCO::getSectionName() const {
-    return "Process CO";
-}
-
-LogCodeArray ProcessCO::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

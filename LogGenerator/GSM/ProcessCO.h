@@ -5,15 +5,14 @@
 // purpose); other codes log "Received an unknown log message: %d"; records under 16 bytes change nothing.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class ProcessCO : public Base {
+class ProcessCO : public TableDecoder {
   public:
+    ProcessCO();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

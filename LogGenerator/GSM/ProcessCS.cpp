@@ -2,6 +2,8 @@
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/MobilityStateNames.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -15,24 +17,18 @@ constexpr RecordField kMmFields[] = {
 };
 
 constexpr gsm::RecordRule kRules[] = {
-    {0x7131, kMobilityRecordMinimumLength, kMmFields},
-    {0x7132, kMobilityRecordMinimumLength, kRegistrationStateFields},
+    {kLogCodeMmState, kMobilityRecordMinimumLength, kMmFields},
+    {kLogCodeRegistrationState, kMobilityRecordMinimumLength, kRegistrationStateFields},
 };
 
 }  // namespace
+
+ProcessCS::ProcessCS() : TableDecoder(rowOf<ProcessCS>(kGsmDecoders)) {}
 
 void ProcessCS::updateWithData(ByteView data, std::int32_t logCode) {
     if (const gsm::RecordRule* rule = gsm::admitRecord("ProcessCS", kRules, data, logCode)) {
         gsm::writeRuleFields(*rule, data, sectionDictionary().get());
     }
-}
-
-std::string_view ProcessCS::getSectionName() const {
-    return "Process CS";
-}
-
-LogCodeArray ProcessCS::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

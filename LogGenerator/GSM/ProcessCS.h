@@ -5,15 +5,14 @@
 // message: %d"; records under 16 bytes change nothing.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class ProcessCS : public Base {
+class ProcessCS : public TableDecoder {
   public:
+    ProcessCS();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

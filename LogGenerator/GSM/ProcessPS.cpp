@@ -2,6 +2,8 @@
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/MobilityStateNames.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -15,24 +17,18 @@ constexpr RecordField kGmmFields[] = {
 };
 
 constexpr gsm::RecordRule kRules[] = {
-    {0x7130, kMobilityRecordMinimumLength, kGmmFields},
-    {0x7132, kMobilityRecordMinimumLength, kRegistrationStateFields},
+    {kLogCodeGmmState, kMobilityRecordMinimumLength, kGmmFields},
+    {kLogCodeRegistrationState, kMobilityRecordMinimumLength, kRegistrationStateFields},
 };
 
 }  // namespace
+
+ProcessPS::ProcessPS() : TableDecoder(rowOf<ProcessPS>(kGsmDecoders)) {}
 
 void ProcessPS::updateWithData(ByteView data, std::int32_t logCode) {
     if (const gsm::RecordRule* rule = gsm::admitRecord("ProcessPS", kRules, data, logCode)) {
         gsm::writeRuleFields(*rule, data, sectionDictionary().get());
     }
-}
-
-std::string_view ProcessPS::getSectionName() const {
-    return "Process PS";
-}
-
-LogCodeArray ProcessPS::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

@@ -6,15 +6,14 @@
 // beyond them).
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class ProcessPS : public Base {
+class ProcessPS : public TableDecoder {
   public:
+    ProcessPS();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

@@ -1,8 +1,10 @@
 #include "LogGenerator/GSM/ServingPLMN.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/StringFormat.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -32,12 +34,10 @@ constexpr RecordField kSelectionModeFields[] = {
     u8Field(14, "PLMN Sel Mod", asName(kSelectionModeNames)),
 };
 
-constexpr std::int32_t kRegistrationCode = 0x7135;
-
 constexpr gsm::RecordRule kRules[] = {
-    {kRegistrationCode, 32},
-    {0x7132, 16, kSelectionModeFields},
-    {gsm::kCellMonitorCode, 0},
+    {kLogCodeRegistrationInfo, 32},
+    {kLogCodeRegistrationState, 16, kSelectionModeFields},
+    {kLogCodeCellMonitor, 0},
 };
 
 // A BCD digit as a character: 0..9 as the digit, 10..15 (the filler 0xF among them) as a blank.
@@ -79,6 +79,8 @@ void writeServingCell(ByteView data, PlistDictionary* section) {
 
 }  // namespace
 
+ServingPLMN::ServingPLMN() : TableDecoder(rowOf<ServingPLMN>(kGsmDecoders)) {}
+
 void ServingPLMN::updateWithData(ByteView data, std::int32_t logCode) {
     const gsm::RecordRule* rule = gsm::admitRecord("Serving PLMN", kRules, data, logCode);
     if (rule == nullptr) {
@@ -86,24 +88,16 @@ void ServingPLMN::updateWithData(ByteView data, std::int32_t logCode) {
     }
     const PlistDictionaryRef section = sectionDictionary();
     switch (rule->code) {
-        case kRegistrationCode:
+        case kLogCodeRegistrationInfo:
             writeRegistration(data, section.get());
             break;
-        case gsm::kCellMonitorCode:
+        case kLogCodeCellMonitor:
             writeServingCell(data, section.get());
             break;
         default:
             gsm::writeRuleFields(*rule, data, section.get());
             break;
     }
-}
-
-std::string_view ServingPLMN::getSectionName() const {
-    return "Serving PLMN";
-}
-
-LogCodeArray ServingPLMN::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

@@ -7,15 +7,14 @@
 // write keeps its earlier value.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class ServingPLMN : public Base {
+class ServingPLMN : public TableDecoder {
   public:
+    ServingPLMN();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

@@ -1,8 +1,8 @@
 #include "LogGenerator/GSM/SimInfo.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
-#include "LogGenerator/GSM/GsmLogCodes.h"
 #include "LogGenerator/GSM/LogCode_0xFF0000.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -32,6 +32,8 @@ constexpr SimFileKey kSimFiles[] = {
 
 }  // namespace
 
+SimInfo::SimInfo() : TableDecoder(kSimInfoRow) {}
+
 void SimInfo::updateWithData(ByteView data, std::int32_t logCode) {
     gsm::logDecoderEntry("SimInfo");
     if (logCode != kLogCodeSimFiles) {
@@ -48,14 +50,6 @@ void SimInfo::updateWithData(ByteView data, std::int32_t logCode) {
             section->set(file.displayKey, *value);
         }
     }
-}
-
-std::string_view SimInfo::getSectionName() const {
-    return "SIM Info";
-}
-
-LogCodeArray SimInfo::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCodeSimFiles};
 }
 
 }  // namespace velmar

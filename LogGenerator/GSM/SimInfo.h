@@ -7,15 +7,18 @@
 // Other codes are ignored without a message.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
+#include "core/platform/logcodes/ExtraLogCodes.h"
 
 namespace velmar {
 
-class SimInfo : public Base {
+class SimInfo : public TableDecoder {
   public:
+    SimInfo();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
+
+// The row of every technology's decoder table.
+inline constexpr DecoderRow kSimInfoRow = VELMAR_DECODER_ROW(SimInfo, "SIM Info", kLogCodeSimFiles);
 
 }  // namespace velmar

@@ -1,8 +1,10 @@
 #include "LogGenerator/GSM/UMTSRRInfo.h"
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/StringFormat.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -35,12 +37,12 @@ constexpr RecordField kCipheringFields[] = {
     u8Field(13, "Ciphering", asName(kCipheringNames)),
 };
 
-constexpr std::int32_t kTransmitPowerCode = 0x4031;
-constexpr std::int32_t kCellIdentityCode = 0x4127;
-
 constexpr gsm::RecordRule kRules[] = {
-    {0x4125, 14, kRrcStateFields},  {kTransmitPowerCode, 16},   {kCellIdentityCode, 29},
-    {0x4157, 19, kCipheringFields}, {gsm::kCellMonitorCode, 0},
+    {kLogCodeUmtsRrcState, 14, kRrcStateFields},
+    {kLogCodeUmtsTransmitPower, 16},
+    {kLogCodeUmtsCellIdentity, 29},
+    {kLogCodeUmtsCiphering, 19, kCipheringFields},
+    {kLogCodeCellMonitor, 0},
 };
 
 // 0x4031: the mean of the non-zero uplink power readings. With no such reading the mean is 0 / 0 and shows
@@ -93,6 +95,8 @@ void writeServingCell(ByteView data, PlistDictionary* section) {
 
 }  // namespace
 
+UMTSRRInfo::UMTSRRInfo() : TableDecoder(rowOf<UMTSRRInfo>(kGsmDecoders)) {}
+
 void UMTSRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
     const gsm::RecordRule* rule = gsm::admitRecord("UMTSRRInfo", kRules, data, logCode);
     if (rule == nullptr) {
@@ -100,27 +104,19 @@ void UMTSRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
     }
     const PlistDictionaryRef section = sectionDictionary();
     switch (rule->code) {
-        case kTransmitPowerCode:
+        case kLogCodeUmtsTransmitPower:
             writeTransmitPower(data, section.get());
             break;
-        case kCellIdentityCode:
+        case kLogCodeUmtsCellIdentity:
             writeCellIdentity(data, section.get());
             break;
-        case gsm::kCellMonitorCode:
+        case kLogCodeCellMonitor:
             writeServingCell(data, section.get());
             break;
         default:
             gsm::writeRuleFields(*rule, data, section.get());
             break;
     }
-}
-
-std::string_view UMTSRRInfo::getSectionName() const {
-    return "UMTS RR Info";
-}
-
-LogCodeArray UMTSRRInfo::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

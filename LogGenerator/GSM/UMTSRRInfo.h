@@ -7,15 +7,14 @@
 // the cell-monitor array wrote; the next cell-monitor record writes it again.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class UMTSRRInfo : public Base {
+class UMTSRRInfo : public TableDecoder {
   public:
+    UMTSRRInfo();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

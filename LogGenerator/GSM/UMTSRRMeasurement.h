@@ -8,7 +8,7 @@ namespace velmar {
 
 class UMTSRRMeasurement : public PlaceholderDecoder {
   public:
-    UMTSRRMeasurement() : PlaceholderDecoder("UMTSRRMeasurement", "UMTS RR Measurement") {}
+    UMTSRRMeasurement();
 };
 
 }  // namespace velmar

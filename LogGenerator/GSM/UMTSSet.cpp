@@ -2,9 +2,10 @@
 
 #include "LogGenerator/GSM/CellMonitorWalk.h"
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
-#include "LogGenerator/GSM/GsmLogCodes.h"
+#include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/GSM/RecordRows.h"
 #include "core/platform/KxServerProtocol.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
@@ -12,7 +13,7 @@ namespace {
 
 constexpr gsm::RecordRule kRules[] = {
     {kLogCodeUmtsIdleMeasurements, 15},
-    {gsm::kCellMonitorCode, 0},
+    {kLogCodeCellMonitor, 0},
 };
 
 // Written in this key order, which is not the order of the fields in the entry.
@@ -38,25 +39,19 @@ constexpr NeighbourCellField kNeighbourCellFields[] = {
 
 }  // namespace
 
+UMTSSet::UMTSSet() : TableDecoder(rowOf<UMTSSet>(kGsmDecoders)) {}
+
 void UMTSSet::updateWithData(ByteView data, std::int32_t logCode) {
     const gsm::RecordRule* rule = gsm::admitRecord("UMTSSet", kRules, data, logCode);
     if (rule == nullptr) {
         return;
     }
-    if (rule->code == gsm::kCellMonitorCode) {
+    if (rule->code == kLogCodeCellMonitor) {
         showNeighbourCells(data, kKxCellMonitorRadioAccessTechnologyUMTS, kNeighbourCellFields,
                            sectionArray());
     } else {
         showRecordRows(kUmtsCells, RecordReader(data), sectionArray());
     }
-}
-
-std::string_view UMTSSet::getSectionName() const {
-    return "UMTS Set";
-}
-
-LogCodeArray UMTSSet::getLogCodeArray() const {
-    return gsm::codesOf(kRules);
 }
 
 }  // namespace velmar

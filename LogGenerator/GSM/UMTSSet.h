@@ -3,15 +3,14 @@
 // UMTS neighbours of the cell-monitor record (0xFF0001).
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class UMTSSet : public Base {
+class UMTSSet : public TableDecoder {
   public:
+    UMTSSet();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

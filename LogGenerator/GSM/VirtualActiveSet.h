@@ -8,7 +8,7 @@ namespace velmar {
 
 class VirtualActiveSet : public CellSetDecoder {
   public:
-    VirtualActiveSet() : CellSetDecoder("VirtualActiveSet", "Virtual Active Set", false) {}
+    VirtualActiveSet();
 };
 
 }  // namespace velmar

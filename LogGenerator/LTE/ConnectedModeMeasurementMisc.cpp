@@ -1,8 +1,10 @@
 #include "LogGenerator/LTE/ConnectedModeMeasurementMisc.h"
 
+#include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
@@ -10,8 +12,8 @@ namespace {
 
 using namespace lte_layout::intra_frequency;
 
-constexpr RecordPreamble kPreamble{"Connected mode LTE Intra-frequency Measurement", kLogCode,
-                                   kMinimumLength};
+constexpr RecordPreamble kPreamble{"Connected mode LTE Intra-frequency Measurement",
+                                   kLogCodeLteIntraFrequency, kMinimumLength};
 
 constexpr RecordField kFields[] = {
     u16Field(17, "E-ARFCN"),
@@ -23,13 +25,8 @@ constexpr RecordField kFields[] = {
 
 }  // namespace
 
-std::string_view ConnectedModeMeasurementMisc::getSectionName() const {
-    return "Connected mode LTE Intra-frequency Measurement";
-}
-
-LogCodeArray ConnectedModeMeasurementMisc::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+ConnectedModeMeasurementMisc::ConnectedModeMeasurementMisc()
+    : TableDecoder(rowOf<ConnectedModeMeasurementMisc>(kLteDecoders)) {}
 
 void ConnectedModeMeasurementMisc::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

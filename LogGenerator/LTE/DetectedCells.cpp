@@ -1,9 +1,11 @@
 #include "LogGenerator/LTE/DetectedCells.h"
 
+#include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
@@ -11,7 +13,7 @@ namespace {
 
 using namespace lte_layout::intra_frequency;
 
-constexpr RecordPreamble kPreamble{"Detected Cells", kLogCode, kMinimumLength};
+constexpr RecordPreamble kPreamble{"Detected Cells", kLogCodeLteIntraFrequency, kMinimumLength};
 
 constexpr RecordField kEntryFields[] = {
     u16Field(0, "Physical Cell ID"),
@@ -19,13 +21,7 @@ constexpr RecordField kEntryFields[] = {
 
 }  // namespace
 
-std::string_view DetectedCells::getSectionName() const {
-    return "Detected Cells";
-}
-
-LogCodeArray DetectedCells::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+DetectedCells::DetectedCells() : TableDecoder(rowOf<DetectedCells>(kLteDecoders)) {}
 
 void DetectedCells::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

@@ -5,15 +5,14 @@
 // neighbour entries; a count of zero leaves it empty. Entries are read where the counts put them.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class DetectedCells : public Base {
+class DetectedCells : public TableDecoder {
   public:
+    DetectedCells();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

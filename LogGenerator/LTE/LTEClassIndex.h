@@ -1,48 +1,50 @@
-// LTEClassIndex: the LTE technology's record decoders and their subscriptions.
+// LTEClassIndex: the LTE technology's record decoders and the log codes they subscribe to.
 //
-// Contract: creates, in this order, the decoders of the serving cell (0xB0C2, 0xB0C1, 0xFF0001), the three of
-// the connected-mode record 0xB179, the idle-mode serving measurements (0xB17F), the two of the neighbour
-// record 0xB180, the two of the reselection record 0xB186, and the shared SIM-file (0xFF0000) and PDP-context
-// (0xFF0002) decoders; the order of creation is the order in which a shared code reaches them. Destruction
-// writes "Deallocing LTEClassIndex" to standard output, releases the decoders in creation order, and then the
-// base writes its own line.
+// Contract: kLteDecoders below is the table from which the index creates its decoders, in its order, which
+// is the order in which the decoders sharing a code receive it (0xB179 feeds three sections, 0xB180 and
+// 0xB186 two each). Destruction writes "Deallocing LTEClassIndex" to standard output, releases the decoders
+// in creation order, and then the base writes its own line.
 #pragma once
 
-#include <memory>
-
 #include "LogGenerator/ClassIndex.h"
+#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/GSM/PDPContextList.h"
+#include "LogGenerator/GSM/SimInfo.h"
+#include "LogGenerator/LTE/ConnectedModeMeasurementMisc.h"
+#include "LogGenerator/LTE/DetectedCells.h"
+#include "LogGenerator/LTE/LTEServingCellInfo.h"
+#include "LogGenerator/LTE/MeasuredNeighborCells.h"
+#include "LogGenerator/LTE/NeighborCellsList.h"
+#include "LogGenerator/LTE/NeighborMeasurementMisc.h"
+#include "LogGenerator/LTE/ReselectionCandidatesList.h"
+#include "LogGenerator/LTE/ReselectionCandidatesMisc.h"
+#include "LogGenerator/LTE/ServingCellMeasurement.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
-class LTEServingCellInfo;
-class ConnectedModeMeasurementMisc;
-class MeasuredNeighborCells;
-class DetectedCells;
-class ServingCellMeasurement;
-class NeighborMeasurementMisc;
-class NeighborCellsList;
-class ReselectionCandidatesMisc;
-class ReselectionCandidatesList;
-class SimInfo;
-class PDPContextList;
+inline constexpr DecoderRow kLteDecoders[] = {
+    VELMAR_DECODER_ROW(LTEServingCellInfo, "Serving Cell Info", kLogCodeLteServingCellInfo,
+                       kLogCodeLteMasterInformation, kLogCodeCellMonitor),
+    VELMAR_DECODER_ROW(ConnectedModeMeasurementMisc, "Connected mode LTE Intra-frequency Measurement",
+                       kLogCodeLteIntraFrequency),
+    VELMAR_DECODER_ROW(MeasuredNeighborCells, "Measured Neighbor Cells", kLogCodeLteIntraFrequency),
+    VELMAR_DECODER_ROW(DetectedCells, "Detected Cells", kLogCodeLteIntraFrequency),
+    VELMAR_DECODER_ROW(ServingCellMeasurement, "Serving Cell Measurements",
+                       kLogCodeLteIdleServingMeasurement),
+    VELMAR_DECODER_ROW(NeighborMeasurementMisc, "Neighbor Measurements", kLogCodeLteIdleNeighbourMeasurement),
+    VELMAR_DECODER_ROW(NeighborCellsList, "Neighbor Cells List", kLogCodeLteIdleNeighbourMeasurement),
+    VELMAR_DECODER_ROW(ReselectionCandidatesMisc, "Reselection Candidates", kLogCodeLteReselectionCandidates),
+    VELMAR_DECODER_ROW(ReselectionCandidatesList, "Reselection Candidates List",
+                       kLogCodeLteReselectionCandidates),
+    kSimInfoRow,
+    kPDPContextListRow,
+};
 
 class LTEClassIndex : public ClassIndex {
   public:
-    LTEClassIndex();
+    LTEClassIndex() : ClassIndex(kLteDecoders) {}
     ~LTEClassIndex() override;
-
-  private:
-    std::shared_ptr<LTEServingCellInfo> objLTEServingCellInfo;
-    std::shared_ptr<ConnectedModeMeasurementMisc> objConnectedModeMeasurementMisc;
-    std::shared_ptr<MeasuredNeighborCells> objMeasuredNeighborCells;
-    std::shared_ptr<DetectedCells> objDetectedCells;
-    std::shared_ptr<ServingCellMeasurement> objServingCellMeasurement;
-    std::shared_ptr<NeighborMeasurementMisc> objNeighborMeasurementMisc;
-    std::shared_ptr<NeighborCellsList> objNeighborCellsList;
-    std::shared_ptr<ReselectionCandidatesMisc> objReselectionCandidatesMisc;
-    std::shared_ptr<ReselectionCandidatesList> objReselectionCandidatesList;
-    std::shared_ptr<SimInfo> objSimInfo;
-    std::shared_ptr<PDPContextList> objPDPContextList;
 };
 
 }  // namespace velmar

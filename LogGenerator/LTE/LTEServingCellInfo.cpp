@@ -1,19 +1,18 @@
 #include "LogGenerator/LTE/LTEServingCellInfo.h"
 
 #include "LogGenerator/CellInfoArray.h"
+#include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
 #include "LogGenerator/ServingCellWalk.h"
 #include "core/platform/KxServerProtocol.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
 constexpr const char* kTitle = "LTE Serving Cell Info";
-constexpr std::int32_t kServingCellInfoCode = 0xB0C2;
-constexpr std::int32_t kMasterInformationCode = 0xB0C1;
-constexpr std::int32_t kCellMonitorCode = 0xFF0001;
 constexpr std::size_t kServingCellInfoMinimum = 38;
 constexpr std::size_t kMasterInformationMinimum = 22;
 constexpr const char* kUarfcnKey = "UARFCN";
@@ -53,20 +52,14 @@ constexpr CellMonitorField kCellMonitorFields[] = {
 
 }  // namespace
 
-std::string_view LTEServingCellInfo::getSectionName() const {
-    return "Serving Cell Info";
-}
-
-LogCodeArray LTEServingCellInfo::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kServingCellInfoCode, kMasterInformationCode, kCellMonitorCode};
-}
+LTEServingCellInfo::LTEServingCellInfo() : TableDecoder(rowOf<LTEServingCellInfo>(kLteDecoders)) {}
 
 void LTEServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
     logDecoderTitle(kTitle);
     const PlistDictionaryRef section = sectionDictionary();
     const RecordReader record(data);
     switch (logCode) {
-        case kServingCellInfoCode: {
+        case kLogCodeLteServingCellInfo: {
             if (data.size() < kServingCellInfoMinimum) {
                 return;
             }
@@ -77,7 +70,7 @@ void LTEServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
             }
             return;
         }
-        case kMasterInformationCode: {
+        case kLogCodeLteMasterInformation: {
             if (data.size() < kMasterInformationMinimum) {
                 return;
             }
@@ -89,7 +82,7 @@ void LTEServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
             reportUnknownLogMessage(logCode);
             return;
         }
-        case kCellMonitorCode: {
+        case kLogCodeCellMonitor: {
             const CellInfoArray cellInfo(data);
             if (cellInfo.holdsNothing()) {
                 SystemLog::log(kLogError, "Failed to get Cell Array\n");

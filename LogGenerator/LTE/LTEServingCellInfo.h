@@ -8,15 +8,14 @@
 // searched for the first serving LTE cell; its missing numbers are logged and leave their keys as they were.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class LTEServingCellInfo : public Base {
+class LTEServingCellInfo : public TableDecoder {
   public:
+    LTEServingCellInfo();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

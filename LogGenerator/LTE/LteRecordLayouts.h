@@ -10,7 +10,6 @@ namespace velmar::lte_layout {
 
 // 0xB179, connected-mode intra-frequency measurements.
 namespace intra_frequency {
-inline constexpr std::int32_t kLogCode = 0xB179;
 inline constexpr std::size_t kMinimumLength = 29;
 inline constexpr std::size_t kMeasuredCountOffset = 27;  // N
 inline constexpr std::size_t kDetectedCountOffset = 28;  // D
@@ -21,13 +20,11 @@ inline constexpr std::size_t kDetectedEntryLength = 2;
 
 // 0xB17F, idle-mode serving cell measurements.
 namespace serving_measurement {
-inline constexpr std::int32_t kLogCode = 0xB17F;
 inline constexpr std::size_t kMinimumLength = 33;
 }  // namespace serving_measurement
 
 // 0xB180, idle-mode neighbour measurements: bits 6..10 of the 16 bits at 19 hold the cell count minus one.
 namespace neighbor_measurement {
-inline constexpr std::int32_t kLogCode = 0xB180;
 inline constexpr std::size_t kMinimumLength = 21;
 inline constexpr std::size_t kCountOffset = 19;
 inline constexpr unsigned kCountLowBit = 6;
@@ -38,7 +35,6 @@ inline constexpr std::size_t kEntryLength = 20;
 
 // 0xB186, idle-mode reselection candidates: only the low 8 bits of the 16-bit count at 19 are used.
 namespace reselection {
-inline constexpr std::int32_t kLogCode = 0xB186;
 inline constexpr std::size_t kMinimumLength = 21;
 inline constexpr std::size_t kCountOffset = 19;
 inline constexpr std::size_t kEntriesOffset = 21;

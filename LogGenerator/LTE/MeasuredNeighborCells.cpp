@@ -1,9 +1,11 @@
 #include "LogGenerator/LTE/MeasuredNeighborCells.h"
 
+#include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
@@ -11,7 +13,7 @@ namespace {
 
 using namespace lte_layout::intra_frequency;
 
-constexpr RecordPreamble kPreamble{"Measured Neighbor Cells", kLogCode, kMinimumLength};
+constexpr RecordPreamble kPreamble{"Measured Neighbor Cells", kLogCodeLteIntraFrequency, kMinimumLength};
 
 // Offsets within a measured-neighbour entry.
 constexpr RecordField kEntryFields[] = {
@@ -22,13 +24,7 @@ constexpr RecordField kEntryFields[] = {
 
 }  // namespace
 
-std::string_view MeasuredNeighborCells::getSectionName() const {
-    return "Measured Neighbor Cells";
-}
-
-LogCodeArray MeasuredNeighborCells::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+MeasuredNeighborCells::MeasuredNeighborCells() : TableDecoder(rowOf<MeasuredNeighborCells>(kLteDecoders)) {}
 
 void MeasuredNeighborCells::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

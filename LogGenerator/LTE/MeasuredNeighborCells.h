@@ -6,15 +6,14 @@
 // whatever the record's length (bytes past its end read as zero).
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class MeasuredNeighborCells : public Base {
+class MeasuredNeighborCells : public TableDecoder {
   public:
+    MeasuredNeighborCells();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

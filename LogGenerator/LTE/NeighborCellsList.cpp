@@ -1,9 +1,11 @@
 #include "LogGenerator/LTE/NeighborCellsList.h"
 
+#include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
@@ -11,7 +13,8 @@ namespace {
 
 using namespace lte_layout::neighbor_measurement;
 
-constexpr RecordPreamble kPreamble{"Neighbor Cells List", kLogCode, kMinimumLength};
+constexpr RecordPreamble kPreamble{"Neighbor Cells List", kLogCodeLteIdleNeighbourMeasurement,
+                                   kMinimumLength};
 
 // Offsets within a 20-byte neighbour entry. Every level is in half dB, RSRP included; the antenna-1 offsets
 // are read from the antenna-0 bits.
@@ -47,13 +50,7 @@ void traceEntry(const RecordReader& record, std::size_t base) {
 
 }  // namespace
 
-std::string_view NeighborCellsList::getSectionName() const {
-    return "Neighbor Cells List";
-}
-
-LogCodeArray NeighborCellsList::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+NeighborCellsList::NeighborCellsList() : TableDecoder(rowOf<NeighborCellsList>(kLteDecoders)) {}
 
 void NeighborCellsList::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

@@ -6,15 +6,14 @@
 // neighbour levels are scaled by half a dB, and the antenna-1 offsets repeat the antenna-0 bits.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class NeighborCellsList : public Base {
+class NeighborCellsList : public TableDecoder {
   public:
+    NeighborCellsList();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

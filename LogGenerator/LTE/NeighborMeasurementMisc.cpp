@@ -1,8 +1,10 @@
 #include "LogGenerator/LTE/NeighborMeasurementMisc.h"
 
+#include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
@@ -10,7 +12,8 @@ namespace {
 
 using namespace lte_layout::neighbor_measurement;
 
-constexpr RecordPreamble kPreamble{"Neighbor Measurements", kLogCode, kMinimumLength};
+constexpr RecordPreamble kPreamble{"Neighbor Measurements", kLogCodeLteIdleNeighbourMeasurement,
+                                   kMinimumLength};
 
 constexpr RecordField kFields[] = {
     u8Field(13, "Version"),
@@ -20,13 +23,8 @@ constexpr RecordField kFields[] = {
 
 }  // namespace
 
-std::string_view NeighborMeasurementMisc::getSectionName() const {
-    return "Neighbor Measurements";
-}
-
-LogCodeArray NeighborMeasurementMisc::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+NeighborMeasurementMisc::NeighborMeasurementMisc()
+    : TableDecoder(rowOf<NeighborMeasurementMisc>(kLteDecoders)) {}
 
 void NeighborMeasurementMisc::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

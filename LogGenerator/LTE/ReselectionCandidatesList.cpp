@@ -1,11 +1,13 @@
 #include "LogGenerator/LTE/ReselectionCandidatesList.h"
 
 #include <span>
+#include "LogGenerator/LTE/LTEClassIndex.h"
 
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
@@ -13,7 +15,8 @@ namespace {
 
 using namespace lte_layout::reselection;
 
-constexpr RecordPreamble kPreamble{"Reselection Candidates List", kLogCode, kMinimumLength};
+constexpr RecordPreamble kPreamble{"Reselection Candidates List", kLogCodeLteReselectionCandidates,
+                                   kMinimumLength};
 
 constexpr ValueName kRatNameRows[] = {
     {0, 0, "LTE"}, {1, 1, "UTRAN"}, {2, 2, "GERAN"}, {3, 3, "CDMA1XRTT"}, {4, 4, "CDMAHRPD"},
@@ -53,13 +56,8 @@ constexpr std::span<const RecordField> kTechnologyFields[] = {kLteFields, kUtran
 
 }  // namespace
 
-std::string_view ReselectionCandidatesList::getSectionName() const {
-    return "Reselection Candidates List";
-}
-
-LogCodeArray ReselectionCandidatesList::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+ReselectionCandidatesList::ReselectionCandidatesList()
+    : TableDecoder(rowOf<ReselectionCandidatesList>(kLteDecoders)) {}
 
 void ReselectionCandidatesList::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

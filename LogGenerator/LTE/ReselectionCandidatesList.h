@@ -7,15 +7,14 @@
 // technology is shown as "??" with no fields of its own.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class ReselectionCandidatesList : public Base {
+class ReselectionCandidatesList : public TableDecoder {
   public:
+    ReselectionCandidatesList();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

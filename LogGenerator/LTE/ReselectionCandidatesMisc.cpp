@@ -1,8 +1,10 @@
 #include "LogGenerator/LTE/ReselectionCandidatesMisc.h"
 
+#include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
@@ -10,7 +12,8 @@ namespace {
 
 using namespace lte_layout::reselection;
 
-constexpr RecordPreamble kPreamble{"Reselection Candidates", kLogCode, kMinimumLength};
+constexpr RecordPreamble kPreamble{"Reselection Candidates", kLogCodeLteReselectionCandidates,
+                                   kMinimumLength};
 
 constexpr RecordField kFields[] = {
     u8Field(13, "Version"),
@@ -20,13 +23,8 @@ constexpr RecordField kFields[] = {
 
 }  // namespace
 
-std::string_view ReselectionCandidatesMisc::getSectionName() const {
-    return "Reselection Candidates";
-}
-
-LogCodeArray ReselectionCandidatesMisc::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+ReselectionCandidatesMisc::ReselectionCandidatesMisc()
+    : TableDecoder(rowOf<ReselectionCandidatesMisc>(kLteDecoders)) {}
 
 void ReselectionCandidatesMisc::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

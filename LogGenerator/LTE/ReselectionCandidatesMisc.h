@@ -4,15 +4,14 @@
 // Contract: a record under 21 bytes changes nothing; another code is reported as unknown.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class ReselectionCandidatesMisc : public Base {
+class ReselectionCandidatesMisc : public TableDecoder {
   public:
+    ReselectionCandidatesMisc();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

@@ -1,8 +1,10 @@
 #include "LogGenerator/LTE/ServingCellMeasurement.h"
 
+#include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
 
@@ -10,7 +12,8 @@ namespace {
 
 using namespace lte_layout::serving_measurement;
 
-constexpr RecordPreamble kPreamble{"Serving Cell Measurements", kLogCode, kMinimumLength};
+constexpr RecordPreamble kPreamble{"Serving Cell Measurements", kLogCodeLteIdleServingMeasurement,
+                                   kMinimumLength};
 
 constexpr const char* kNotPresent = "Not Present";
 
@@ -41,13 +44,8 @@ constexpr RecordField kFields[] = {
 
 }  // namespace
 
-std::string_view ServingCellMeasurement::getSectionName() const {
-    return "Serving Cell Measurements";
-}
-
-LogCodeArray ServingCellMeasurement::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+ServingCellMeasurement::ServingCellMeasurement()
+    : TableDecoder(rowOf<ServingCellMeasurement>(kLteDecoders)) {}
 
 void ServingCellMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

@@ -6,15 +6,14 @@
 // so it never shows it.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class ServingCellMeasurement : public Base {
+class ServingCellMeasurement : public TableDecoder {
   public:
+    ServingCellMeasurement();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

@@ -3,8 +3,10 @@
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "LogGenerator/UTRAN/UtranRecordLayouts.h"
 #include "core/platform/StringFormat.h"
+#include "core/platform/logcodes/UtranLogCodes.h"
 
 namespace velmar {
 
@@ -12,7 +14,7 @@ namespace {
 
 using namespace utran_layout::channel_quality;
 
-constexpr RecordPreamble kPreamble{"CCTRCH SIR Measurement", kLogCode, kMinimumLength,
+constexpr RecordPreamble kPreamble{"CCTRCH SIR Measurement", kLogCodeUtranChannelQuality, kMinimumLength,
                                    RecordPreamble::OtherCodes::Ignored};
 
 constexpr RecordField kEntryFields[] = {
@@ -35,13 +37,7 @@ PlistValue compositeChannelRow(const RecordReader& record, std::size_t base) {
 
 }  // namespace
 
-std::string_view CCTRCHSIRMeasurement::getSectionName() const {
-    return "CCTRCH SIR";
-}
-
-LogCodeArray CCTRCHSIRMeasurement::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+CCTRCHSIRMeasurement::CCTRCHSIRMeasurement() : TableDecoder(rowOf<CCTRCHSIRMeasurement>(kUtranDecoders)) {}
 
 void CCTRCHSIRMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

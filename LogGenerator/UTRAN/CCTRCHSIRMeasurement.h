@@ -5,15 +5,14 @@
 // at 289 + 34n + 8k, n being the transport-channel count; each shows exactly six SIR values.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class CCTRCHSIRMeasurement : public Base {
+class CCTRCHSIRMeasurement : public TableDecoder {
   public:
+    CCTRCHSIRMeasurement();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

@@ -2,13 +2,14 @@
 
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/UTRAN/UTRANClassIndex.h"
+#include "core/platform/logcodes/UtranLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr std::int32_t kLogCode = 0xD00E;
-constexpr RecordPreamble kPreamble{"GSM Neighbor Cell List", kLogCode, 17,
+constexpr RecordPreamble kPreamble{"GSM Neighbor Cell List", kLogCodeUtranGsmNeighbourMeasurement, 17,
                                    RecordPreamble::OtherCodes::Ignored};
 
 constexpr std::size_t kCountOffset = 16;
@@ -27,13 +28,8 @@ constexpr RecordField kEntryFields[] = {
 
 }  // namespace
 
-std::string_view GSMNeighbhorMeasurements::getSectionName() const {
-    return "GSM Neighbor Cell List";
-}
-
-LogCodeArray GSMNeighbhorMeasurements::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+GSMNeighbhorMeasurements::GSMNeighbhorMeasurements()
+    : TableDecoder(rowOf<GSMNeighbhorMeasurements>(kUtranDecoders)) {}
 
 void GSMNeighbhorMeasurements::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

@@ -4,15 +4,14 @@
 // empties the list; the rows are decoded but never installed, so the list always stays empty.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class GSMNeighbhorMeasurements : public Base {
+class GSMNeighbhorMeasurements : public TableDecoder {
   public:
+    GSMNeighbhorMeasurements();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

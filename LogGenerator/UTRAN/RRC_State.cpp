@@ -1,19 +1,20 @@
 #include "LogGenerator/UTRAN/RRC_State.h"
 
 #include <string>
+#include "LogGenerator/UTRAN/UTRANClassIndex.h"
 
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
 #include "core/platform/Json.h"
+#include "core/platform/logcodes/UtranLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr std::int32_t kLogCode = 0xD0E0;
 constexpr std::size_t kExpectedLength = 15;
 // The length is only reported, never enforced.
-constexpr RecordPreamble kPreamble{"RRC Info", kLogCode, 0, RecordPreamble::OtherCodes::Ignored};
+constexpr RecordPreamble kPreamble{"RRC Info", kLogCodeUtranRrcState, 0, RecordPreamble::OtherCodes::Ignored};
 
 constexpr std::size_t kModeValidOffset = 13;
 constexpr std::size_t kModeOffset = 14;
@@ -27,13 +28,7 @@ constexpr ValueNames kStateNames{kStateRows, "Unknown RRC Mode"};
 
 }  // namespace
 
-std::string_view RRC_State::getSectionName() const {
-    return "RRC Info";
-}
-
-LogCodeArray RRC_State::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+RRC_State::RRC_State() : TableDecoder(rowOf<RRC_State>(kUtranDecoders)) {}
 
 void RRC_State::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

@@ -6,15 +6,14 @@
 // when byte 13 is 1, otherwise 255 ("Unknown RRC Mode"). Other codes are ignored silently.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class RRC_State : public Base {
+class RRC_State : public TableDecoder {
   public:
+    RRC_State();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

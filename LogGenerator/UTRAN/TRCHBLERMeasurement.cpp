@@ -3,7 +3,9 @@
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "LogGenerator/UTRAN/UtranRecordLayouts.h"
+#include "core/platform/logcodes/UtranLogCodes.h"
 
 namespace velmar {
 
@@ -11,7 +13,7 @@ namespace {
 
 using namespace utran_layout::channel_quality;
 
-constexpr RecordPreamble kPreamble{"TRCH BLER Measurement", kLogCode, kMinimumLength,
+constexpr RecordPreamble kPreamble{"TRCH BLER Measurement", kLogCodeUtranChannelQuality, kMinimumLength,
                                    RecordPreamble::OtherCodes::Ignored, kLogNotice};
 
 constexpr RecordField kEntryFields[] = {
@@ -21,13 +23,7 @@ constexpr RecordField kEntryFields[] = {
 
 }  // namespace
 
-std::string_view TRCHBLERMeasurement::getSectionName() const {
-    return "TRCH BLER";
-}
-
-LogCodeArray TRCHBLERMeasurement::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+TRCHBLERMeasurement::TRCHBLERMeasurement() : TableDecoder(rowOf<TRCHBLERMeasurement>(kUtranDecoders)) {}
 
 void TRCHBLERMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

@@ -5,15 +5,14 @@
 // ignored silently. The n entries (n from bits 6..11 of the 16 bits at 14) are 2 bytes each from offset 17.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class TRCHBLERMeasurement : public Base {
+class TRCHBLERMeasurement : public TableDecoder {
   public:
+    TRCHBLERMeasurement();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

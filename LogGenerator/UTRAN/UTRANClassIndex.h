@@ -1,40 +1,42 @@
-// UTRANClassIndex: the UTRAN technology's record decoders and their subscriptions.
+// UTRANClassIndex: the UTRAN technology's record decoders and the log codes they subscribe to.
 //
-// Contract: creates, in this order, the RRC state (0xD0E0), serving cell (0xD0E2, 0xFF0001), UTRAN and GSM
-// neighbour (0xD00A, 0xD00E), transport-channel BLER and composite-channel SIR (both 0xD00C, in that order)
-// decoders, then the shared PDP-context (0xFF0002) and SIM-file (0xFF0000) decoders. Destruction releases
-// them in that order and writes no line of its own before the base's.
+// Contract: kUtranDecoders below is the table from which the index creates its decoders, in its order, which
+// is the order in which the decoders sharing a code receive it (0xD00C: transport-channel BLER, then
+// composite-channel SIR). Destruction releases the decoders in creation order and writes no line of its own
+// before the base's.
 #pragma once
 
-#include <memory>
-
 #include "LogGenerator/ClassIndex.h"
+#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/GSM/PDPContextList.h"
+#include "LogGenerator/GSM/SimInfo.h"
+#include "LogGenerator/UTRAN/CCTRCHSIRMeasurement.h"
+#include "LogGenerator/UTRAN/GSMNeighbhorMeasurements.h"
+#include "LogGenerator/UTRAN/RRC_State.h"
+#include "LogGenerator/UTRAN/TRCHBLERMeasurement.h"
+#include "LogGenerator/UTRAN/UTRANNeighbhorMeasurements.h"
+#include "LogGenerator/UTRAN/UTRANServingCellInfo.h"
+#include "core/platform/logcodes/UtranLogCodes.h"
 
 namespace velmar {
 
-class RRC_State;
-class UTRANServingCellInfo;
-class UTRANNeighbhorMeasurements;
-class GSMNeighbhorMeasurements;
-class TRCHBLERMeasurement;
-class CCTRCHSIRMeasurement;
-class PDPContextList;
-class SimInfo;
+inline constexpr DecoderRow kUtranDecoders[] = {
+    VELMAR_DECODER_ROW(RRC_State, "RRC Info", kLogCodeUtranRrcState),
+    VELMAR_DECODER_ROW(UTRANServingCellInfo, "Serving Cell Info", kLogCodeUtranServingCell,
+                       kLogCodeCellMonitor),
+    VELMAR_DECODER_ROW(UTRANNeighbhorMeasurements, "Neighbor Cell List", kLogCodeUtranNeighbourMeasurement),
+    VELMAR_DECODER_ROW(GSMNeighbhorMeasurements, "GSM Neighbor Cell List",
+                       kLogCodeUtranGsmNeighbourMeasurement),
+    VELMAR_DECODER_ROW(TRCHBLERMeasurement, "TRCH BLER", kLogCodeUtranChannelQuality),
+    VELMAR_DECODER_ROW(CCTRCHSIRMeasurement, "CCTRCH SIR", kLogCodeUtranChannelQuality),
+    kPDPContextListRow,
+    kSimInfoRow,
+};
 
 class UTRANClassIndex : public ClassIndex {
   public:
-    UTRANClassIndex();
+    UTRANClassIndex() : ClassIndex(kUtranDecoders) {}
     ~UTRANClassIndex() override;
-
-  private:
-    std::shared_ptr<RRC_State> rrc_state;
-    std::shared_ptr<UTRANServingCellInfo> servingCellInfo;
-    std::shared_ptr<UTRANNeighbhorMeasurements> tdMeasurements;
-    std::shared_ptr<GSMNeighbhorMeasurements> gsmMeasurements;
-    std::shared_ptr<TRCHBLERMeasurement> trchMeasurements;
-    std::shared_ptr<CCTRCHSIRMeasurement> cctrchMeasurements;
-    std::shared_ptr<PDPContextList> pdpList;
-    std::shared_ptr<SimInfo> simInfo;
 };
 
 }  // namespace velmar

@@ -3,13 +3,14 @@
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/UTRAN/UTRANClassIndex.h"
+#include "core/platform/logcodes/UtranLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr std::int32_t kLogCode = 0xD00A;
-constexpr RecordPreamble kPreamble{"NeighbhorMeasurements List", kLogCode, 21,
+constexpr RecordPreamble kPreamble{"NeighbhorMeasurements List", kLogCodeUtranNeighbourMeasurement, 21,
                                    RecordPreamble::OtherCodes::Ignored};
 
 constexpr std::size_t kCountOffset = 16;
@@ -43,13 +44,8 @@ PlistValue neighborRow(const RecordReader& record, std::size_t base) {
 
 }  // namespace
 
-std::string_view UTRANNeighbhorMeasurements::getSectionName() const {
-    return "Neighbor Cell List";
-}
-
-LogCodeArray UTRANNeighbhorMeasurements::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kLogCode};
-}
+UTRANNeighbhorMeasurements::UTRANNeighbhorMeasurements()
+    : TableDecoder(rowOf<UTRANNeighbhorMeasurements>(kUtranDecoders)) {}
 
 void UTRANNeighbhorMeasurements::updateWithData(ByteView data, std::int32_t logCode) {
     if (!acceptRecord(kPreamble, data, logCode)) {

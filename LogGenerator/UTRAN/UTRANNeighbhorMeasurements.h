@@ -6,15 +6,14 @@
 // leaves the row without a "Status" key.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class UTRANNeighbhorMeasurements : public Base {
+class UTRANNeighbhorMeasurements : public TableDecoder {
   public:
+    UTRANNeighbhorMeasurements();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

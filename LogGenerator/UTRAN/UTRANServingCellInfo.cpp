@@ -4,15 +4,15 @@
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordPreamble.h"
 #include "LogGenerator/ServingCellWalk.h"
+#include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "core/platform/KxServerProtocol.h"
+#include "core/platform/logcodes/UtranLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
 constexpr const char* kTitle = "Serving Cell Info";
-constexpr std::int32_t kServingCellCode = 0xD0E2;
-constexpr std::int32_t kCellMonitorCode = 0xFF0001;
 constexpr std::size_t kServingCellMinimum = 26;
 
 constexpr ValueName kAllowedAccessRows[] = {{0, 0, "All Calls"}, {1, 1, "Emergency Calls Only"}};
@@ -40,22 +40,16 @@ constexpr CellMonitorField kCellMonitorFields[] = {
 
 }  // namespace
 
-std::string_view UTRANServingCellInfo::getSectionName() const {
-    return "Serving Cell Info";
-}
-
-LogCodeArray UTRANServingCellInfo::getLogCodeArray() const {
-    return std::vector<std::int32_t>{kServingCellCode, kCellMonitorCode};
-}
+UTRANServingCellInfo::UTRANServingCellInfo() : TableDecoder(rowOf<UTRANServingCellInfo>(kUtranDecoders)) {}
 
 void UTRANServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
     logDecoderTitle(kTitle);
     const PlistDictionaryRef section = sectionDictionary();
-    if (logCode == kServingCellCode) {
+    if (logCode == kLogCodeUtranServingCell) {
         if (data.size() >= kServingCellMinimum && section) {
             writeFields(kServingCellFields, RecordReader(data), 0, *section);
         }
-    } else if (logCode == kCellMonitorCode) {
+    } else if (logCode == kLogCodeCellMonitor) {
         const CellInfoArray cellInfo(data);
         if (!cellInfo.holdsNothing()) {
             writeServingCellFields(*cellInfo.cells(), kKxCellMonitorRadioAccessTechnologyUTRAN2,

@@ -7,15 +7,14 @@
 // their keys as they were. Other codes are ignored silently.
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/DecoderTable.h"
 
 namespace velmar {
 
-class UTRANServingCellInfo : public Base {
+class UTRANServingCellInfo : public TableDecoder {
   public:
+    UTRANServingCellInfo();
     void updateWithData(ByteView data, std::int32_t logCode) override;
-    std::string_view getSectionName() const override;
-    LogCodeArray getLogCodeArray() const override;
 };
 
 }  // namespace velmar

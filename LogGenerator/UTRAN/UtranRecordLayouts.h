@@ -9,7 +9,6 @@
 
 namespace velmar::utran_layout::channel_quality {
 
-inline constexpr std::int32_t kLogCode = 0xD00C;
 inline constexpr std::size_t kMinimumLength = 17;
 
 // Transport channels: the count n is bits 6..11 of the 16 bits at 14; entry k is 2 bytes at 17 + 2k.

@@ -40,7 +40,7 @@ PlistData buildSubpacketRecord(std::uint16_t code, const CdmaSubpacketRecord& re
 }  // namespace
 
 PlistData buildEvdoStatusRecord(const EvdoStatusRecord& record, std::uint64_t timestamp) {
-    return RecordBuilder(kCdmaEvdoStatusCode, timestamp)
+    return RecordBuilder(kLogCodeCdmaEvdoStatus, timestamp)
         .u16(13, record.channel & 0x7FF)
         .bits(14, 1, 3, 7, record.bandClass)
         .s8(15, record.rxAgc0)
@@ -56,7 +56,7 @@ PlistData buildEvdoStatusRecord(const EvdoStatusRecord& record, std::uint64_t ti
 }
 
 PlistData buildEvdoActiveSetRecord(const EvdoActiveSetRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kCdmaEvdoActiveSetCode, timestamp);
+    RecordBuilder builder(kLogCodeCdmaEvdoActiveSet, timestamp);
     builder.u8(15, record.declaredCount.value_or(static_cast<std::uint8_t>(record.pilots.size())));
     constexpr std::size_t kFirstPilot = 25;
     constexpr std::size_t kPilotSize = 12;
@@ -68,7 +68,7 @@ PlistData buildEvdoActiveSetRecord(const EvdoActiveSetRecord& record, std::uint6
 }
 
 PlistData buildFingerC2IRecord(const FingerC2IRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kCdmaFingerC2ICode, timestamp);
+    RecordBuilder builder(kLogCodeCdmaFingerC2I, timestamp);
     builder.u8(22, record.declaredCount.value_or(static_cast<std::uint8_t>(record.fingers.size())));
     constexpr std::size_t kFirstFinger = 23;
     constexpr std::size_t kFingerSize = 14;
@@ -142,15 +142,15 @@ CdmaSubpacket cdma1xTrafficDemodSubpacket(bool erasure) {
 }
 
 PlistData build1xStatusRecord(const CdmaSubpacketRecord& record, std::uint64_t timestamp) {
-    return buildSubpacketRecord(kCdma1xStatusCode, record, timestamp);
+    return buildSubpacketRecord(kLogCodeCdma1xStatus, record, timestamp);
 }
 
 PlistData build1xTrafficRecord(const CdmaSubpacketRecord& record, std::uint64_t timestamp) {
-    return buildSubpacketRecord(kCdma1xTrafficCode, record, timestamp);
+    return buildSubpacketRecord(kLogCodeCdma1xTraffic, record, timestamp);
 }
 
 PlistData build1xSystemIdentityRecord(const Cdma1xSystemIdentityRecord& record, std::uint64_t timestamp) {
-    return RecordBuilder(kCdma1xSystemIdentityCode, timestamp)
+    return RecordBuilder(kLogCodeCdma1xSystemIdentity, timestamp)
         .u8(13, record.version)
         .u32(42, record.roamingIndicator)
         .u32(46, record.systemType)
@@ -164,7 +164,7 @@ PlistData build1xSystemIdentityRecord(const Cdma1xSystemIdentityRecord& record, 
 }
 
 PlistData buildEvdoForwardLinkRecord(const EvdoForwardLinkRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kCdmaForwardLinkCode, timestamp);
+    RecordBuilder builder(kLogCodeCdmaForwardLinkRate, timestamp);
     builder.u32(13, record.sequence);
     for (std::size_t i = 0; i < record.counters.size(); ++i) {
         builder.u32(17 + 4 * i, record.counters[i]);
@@ -173,7 +173,7 @@ PlistData buildEvdoForwardLinkRecord(const EvdoForwardLinkRecord& record, std::u
 }
 
 PlistData buildEvdoReverseLinkRecord(const EvdoReverseLinkRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kCdmaReverseLinkCode, timestamp);
+    RecordBuilder builder(kLogCodeCdmaReverseLinkRate, timestamp);
     builder.u32(14, record.sequence);
     constexpr std::size_t kBlocks = 22;
     constexpr std::size_t kBlockSize = 576;

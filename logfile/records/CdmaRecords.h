@@ -28,18 +28,10 @@
 #include <optional>
 #include <vector>
 
+#include "core/platform/logcodes/CdmaLogCodes.h"
 #include "core/platform/plist/PlistValue.h"
 
 namespace velmar {
-
-inline constexpr std::uint16_t kCdmaFingerC2ICode = 0x108A;
-inline constexpr std::uint16_t kCdmaEvdoStatusCode = 0x1183;
-inline constexpr std::uint16_t kCdmaForwardLinkCode = 0x1192;
-inline constexpr std::uint16_t kCdmaEvdoActiveSetCode = 0x12B6;
-inline constexpr std::uint16_t kCdma1xStatusCode = 0x119C;
-inline constexpr std::uint16_t kCdma1xTrafficCode = 0x119D;
-inline constexpr std::uint16_t kCdmaReverseLinkCode = 0x127E;
-inline constexpr std::uint16_t kCdma1xSystemIdentityCode = 0x134F;
 
 struct EvdoStatusRecord {
     std::uint16_t channel = 0;   // 0..2047

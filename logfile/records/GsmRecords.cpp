@@ -4,6 +4,7 @@
 #include <string_view>
 
 #include "core/platform/KxServerProtocol.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/records/RecordBuilder.h"
 
@@ -32,13 +33,13 @@ PlistData buildExtraRecord(std::uint16_t code, const PlistValue& payload, PlistE
 }  // namespace
 
 PlistData buildGsmServingIdentityRecord(const GsmServingIdentityRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x5134, timestamp);
+    RecordBuilder builder(kLogCodeGsmServingIdentity, timestamp);
     builder.u16(13, record.arfcn).u16(15, record.bsic).u16(17, record.cellId);
     return finish(builder, 26, record.length);
 }
 
 PlistData buildGsmMeasurementRecord(const GsmMeasurementRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x5137, timestamp);
+    RecordBuilder builder(kLogCodeGsmMeasurements, timestamp);
     builder.u8(15, record.rxLevel).u32(16, record.c1).u32(20, record.c2).u8(26, record.reselectHysteresis);
     builder.u8(28, countOf(record.neighbours, record.countOverride));
     std::size_t at = 29;
@@ -50,13 +51,13 @@ PlistData buildGsmMeasurementRecord(const GsmMeasurementRecord& record, std::uin
 }
 
 PlistData buildGsmDedicatedChannelRecord(const GsmDedicatedChannelRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x5076, timestamp);
+    RecordBuilder builder(kLogCodeGsmDedicatedChannel, timestamp);
     builder.u16(13, record.arfcn);
     return finish(builder, 17, record.length);
 }
 
 PlistData buildGsmBsicListRecord(const GsmBsicListRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x51FF, timestamp);
+    RecordBuilder builder(kLogCodeGsmBsicList, timestamp);
     builder.u8(14, countOf(record.entries, record.countOverride));
     std::size_t at = 15;
     for (const GsmBsicEntry& entry : record.entries) {
@@ -67,7 +68,7 @@ PlistData buildGsmBsicListRecord(const GsmBsicListRecord& record, std::uint64_t 
 }
 
 PlistData buildMobileAllocationRecord(const MobileAllocationRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x51F8, timestamp);
+    RecordBuilder builder(kLogCodeGsmMobileAllocation, timestamp);
     builder.u8(13, record.hsn).u8(14, countOf(record.arfcns, record.countOverride));
     std::size_t at = 15;
     for (const std::uint16_t arfcn : record.arfcns) {
@@ -78,7 +79,7 @@ PlistData buildMobileAllocationRecord(const MobileAllocationRecord& record, std:
 }
 
 PlistData buildGsmSetRecord(const GsmSetRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x4005, timestamp);
+    RecordBuilder builder(kLogCodeUmtsIdleMeasurements, timestamp);
     builder.u8(14, countOf(record.cells, record.countOverride));
     std::size_t at = 15;
     for (const GsmSetCell& cell : record.cells) {
@@ -92,7 +93,7 @@ PlistData buildGsmSetRecord(const GsmSetRecord& record, std::uint64_t timestamp)
 }
 
 PlistData buildUmtsSetRecord(const UmtsSetRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x4005, timestamp);
+    RecordBuilder builder(kLogCodeUmtsIdleMeasurements, timestamp);
     builder.u8(13, countOf(record.cells, record.countOverride)).u8(14, 0);
     std::size_t at = 15;
     for (const UmtsSetCell& cell : record.cells) {
@@ -104,7 +105,7 @@ PlistData buildUmtsSetRecord(const UmtsSetRecord& record, std::uint64_t timestam
 }
 
 PlistData buildUmtsCellSetRecord(const UmtsCellSetRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x417A, timestamp);
+    RecordBuilder builder(kLogCodeUmtsCellSets, timestamp);
     builder.s16(13, record.powerReading).u8(15, countOf(record.cells, record.countOverride));
     const std::size_t cellsAt = 16;
     const std::size_t energiesAt = cellsAt + 15 * record.cells.size();
@@ -126,7 +127,7 @@ PlistData buildSimFilesRecord(const SimFilesRecord& record, std::uint64_t timest
     for (const auto& [key, value] : record.files) {
         files->set(key, value);
     }
-    return buildExtraRecord(0x0000, files, record.encoding, timestamp);
+    return buildExtraRecord(extraPacketCode(kLogCodeSimFiles), files, record.encoding, timestamp);
 }
 
 PlistValue cellMonitorEntryDictionary(const CellMonitorEntry& entry) {
@@ -174,7 +175,7 @@ PlistData buildPdpContextsRecord(const std::vector<PdpContext>& contexts, std::u
     for (const PdpContext& context : contexts) {
         array->append(pdpContextDictionary(context));
     }
-    return buildExtraRecord(0x0002, array, PlistEncoding::Binary, timestamp);
+    return buildExtraRecord(extraPacketCode(kLogCodePdpContexts), array, PlistEncoding::Binary, timestamp);
 }
 
 }  // namespace velmar

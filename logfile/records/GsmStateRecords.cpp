@@ -1,5 +1,6 @@
 #include "logfile/records/GsmStateRecords.h"
 
+#include "core/platform/logcodes/GsmLogCodes.h"
 #include "logfile/records/RecordBuilder.h"
 
 namespace velmar {
@@ -22,19 +23,19 @@ std::uint8_t bcdDigit(std::string_view digits, std::size_t index) {
 }  // namespace
 
 PlistData buildGmmStateRecord(const GmmStateRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x7130, timestamp);
+    RecordBuilder builder(kLogCodeGmmState, timestamp);
     builder.u8(13, record.state).u8(14, record.subState).u8(15, record.updateStatus);
     return finish(builder, 16, record.length);
 }
 
 PlistData buildMmStateRecord(const MmStateRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x7131, timestamp);
+    RecordBuilder builder(kLogCodeMmState, timestamp);
     builder.u8(13, record.state).u8(14, record.subState).u8(15, record.locationUpdateStatus);
     return finish(builder, 16, record.length);
 }
 
 PlistData buildRegistrationStateRecord(const RegistrationStateRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x7132, timestamp);
+    RecordBuilder builder(kLogCodeRegistrationState, timestamp);
     builder.u8(13, record.registrationState).u8(14, record.plmnSelectionMode);
     return finish(builder, 16, record.length);
 }
@@ -48,7 +49,7 @@ std::array<std::uint8_t, 3> plmnIdentityBytes(std::string_view mcc, std::string_
 }
 
 PlistData buildRegistrationInfoRecord(const RegistrationInfoRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x7135, timestamp);
+    RecordBuilder builder(kLogCodeRegistrationInfo, timestamp);
     builder.u8(13, record.networkOperatingMode).u8(14, record.serviceType);
     builder.bytes(15, record.plmnIdentity);
     builder.u16be(18, record.locationAreaCode).u8(20, record.routingAreaCode);
@@ -56,31 +57,31 @@ PlistData buildRegistrationInfoRecord(const RegistrationInfoRecord& record, std:
 }
 
 PlistData buildEquivalentPlmnRecord(const EquivalentPlmnRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x7150, timestamp);
+    RecordBuilder builder(kLogCodeEquivalentPlmns, timestamp);
     builder.u8(16, record.count).bytes(17, record.listBytes);
     return finish(builder, 17 + record.listBytes.size(), record.length);
 }
 
 PlistData buildGsmRrStateRecord(const GsmRrStateRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x512C, timestamp);
+    RecordBuilder builder(kLogCodeGsmRrState, timestamp);
     builder.u8(13, record.state).u8(14, record.subState).u8(15, record.status).u8(16, record.mode);
     return finish(builder, 17, record.length);
 }
 
 PlistData buildGsmChannelParametersRecord(const GsmChannelParametersRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x5072, timestamp);
+    RecordBuilder builder(kLogCodeGsmChannelParameters, timestamp);
     builder.u8(19, record.dtxUsed);
     return finish(builder, 20, record.length);
 }
 
 PlistData buildSi13PositionRecord(const Si13PositionRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x51F4, timestamp);
+    RecordBuilder builder(kLogCodeGprsSi13Position, timestamp);
     builder.u8(14, record.si13Position);
     return finish(builder, 15, record.length);
 }
 
 PlistData buildGprsCellOptionsRecord(const GprsCellOptionsRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x51F5, timestamp);
+    RecordBuilder builder(kLogCodeGprsCellOptions, timestamp);
     builder.u8(13, record.pfcSupported)
         .u8(14, record.priorityAccessThreshold)
         .u8(15, record.networkControlOrder);
@@ -88,26 +89,26 @@ PlistData buildGprsCellOptionsRecord(const GprsCellOptionsRecord& record, std::u
 }
 
 PlistData buildGprsTbfParametersRecord(const GprsTbfParametersRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x51F6, timestamp);
+    RecordBuilder builder(kLogCodeGprsTbfParameters, timestamp);
     builder.u8(15, record.t3192).u8(16, record.drxTimerMax).u8(17, record.accessBurstType);
     return finish(builder, 24, record.length);
 }
 
 PlistData buildPbcchRecord(const PbcchRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x51FB, timestamp);
+    RecordBuilder builder(kLogCodeGprsPbcchDescription, timestamp);
     builder.u8(13, record.pbcchPresent);
     return finish(builder, 34, record.length);
 }
 
 PlistData buildPacketSystemInfoRecord(const PacketSystemInfoRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x51FD, timestamp);
+    RecordBuilder builder(kLogCodeGprsPacketSystemInfo, timestamp);
     builder.u8(13, record.packetPsiStatus).u8(14, record.countLr).u8(15, record.countHr);
     builder.u8(16, record.extMeasurementOrder).u8(33, record.packetSiStatus);
     return finish(builder, 35, record.length);
 }
 
 PlistData buildRrcStateRecord(const RrcStateRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x4125, timestamp);
+    RecordBuilder builder(kLogCodeUmtsRrcState, timestamp);
     builder.u8(13, record.state);
     return finish(builder, 14, record.length);
 }
@@ -115,7 +116,7 @@ PlistData buildRrcStateRecord(const RrcStateRecord& record, std::uint64_t timest
 PlistData buildUplinkPowerRecord(const UplinkPowerRecord& record, std::uint64_t timestamp) {
     constexpr std::size_t kFirstEntry = 16;
     constexpr std::size_t kEntryLength = 14;
-    RecordBuilder builder(0x4031, timestamp);
+    RecordBuilder builder(kLogCodeUmtsTransmitPower, timestamp);
     builder.u8(14, record.countOverride.value_or(static_cast<std::uint8_t>(record.readings.size())));
     for (std::size_t i = 0; i < record.readings.size(); ++i) {
         builder.s16(kFirstEntry + kEntryLength * i + 4, record.readings[i]);
@@ -124,14 +125,14 @@ PlistData buildUplinkPowerRecord(const UplinkPowerRecord& record, std::uint64_t 
 }
 
 PlistData buildUmtsCellIdentityRecord(const UmtsCellIdentityRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x4127, timestamp);
+    RecordBuilder builder(kLogCodeUmtsCellIdentity, timestamp);
     builder.u32(13, record.uplinkFrequency).u32(17, record.downlinkFrequency).u32(21, record.cellId);
     builder.u16(25, record.uraId);
     return finish(builder, 29, record.length);
 }
 
 PlistData buildCipheringRecord(const CipheringRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(0x4157, timestamp);
+    RecordBuilder builder(kLogCodeUmtsCiphering, timestamp);
     builder.u8(13, record.ciphering);
     return finish(builder, 19, record.length);
 }
@@ -143,7 +144,7 @@ PlistData buildHsdpaRecord(const HsdpaRecord& record, std::uint64_t timestamp) {
         record.primaryCountOverride.value_or(static_cast<std::uint8_t>(record.primary.size()));
     const auto secondaryCount =
         record.secondaryCountOverride.value_or(static_cast<std::uint8_t>(record.secondary.size()));
-    RecordBuilder builder(0x4221, timestamp);
+    RecordBuilder builder(kLogCodeUmtsHsdpa, timestamp);
     builder.u8(13, record.version).u8(14, record.subFrames & 0xFF);
     builder.bits(15, 1, 0, 1, (record.subFrames >> 8) & 0x3).bits(15, 1, 2, 3, record.carrier & 0x3);
     builder.u8(16, primaryCount).u8(17, secondaryCount);
@@ -165,7 +166,7 @@ PlistData buildHsdpaRecord(const HsdpaRecord& record, std::uint64_t timestamp) {
 PlistData buildBlockErrorRecord(const BlockErrorRecord& record, std::uint64_t timestamp) {
     constexpr std::size_t kFirstEntry = 16;
     constexpr std::size_t kEntryLength = 9;
-    RecordBuilder builder(0x4116, timestamp);
+    RecordBuilder builder(kLogCodeUmtsBlockErrors, timestamp);
     builder.u8(13, record.countOverride.value_or(static_cast<std::uint8_t>(record.channels.size())));
     builder.u16(14, record.windowSize);
     for (std::size_t i = 0; i < record.channels.size(); ++i) {

@@ -17,7 +17,7 @@ PlistData finish(RecordBuilder& builder, std::size_t layoutLength, std::size_t l
 }  // namespace
 
 PlistData buildLteServingCellInfoRecord(const LteServingCellInfoRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kLteServingCellInfoCode, timestamp);
+    RecordBuilder builder(kLogCodeLteServingCellInfo, timestamp);
     builder.u8(13, record.version)
         .u16(14, record.physicalCellId)
         .u16(16, record.downlinkEarfcn)
@@ -31,7 +31,7 @@ PlistData buildLteServingCellInfoRecord(const LteServingCellInfoRecord& record, 
 }
 
 PlistData buildLteMasterInformationRecord(const LteMasterInformationRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kLteMasterInformationCode, timestamp);
+    RecordBuilder builder(kLogCodeLteMasterInformation, timestamp);
     builder.u8(13, record.version)
         .u16(14, record.physicalCellId)
         .u16(16, record.earfcn)
@@ -40,7 +40,7 @@ PlistData buildLteMasterInformationRecord(const LteMasterInformationRecord& reco
 }
 
 PlistData buildLteIntraFrequencyRecord(const LteIntraFrequencyRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kLteIntraFrequencyCode, timestamp);
+    RecordBuilder builder(kLogCodeLteIntraFrequency, timestamp);
     builder.u8(13, record.version)
         .u16(17, record.earfcn)
         .u16(19, record.servingPhysicalCellId)
@@ -65,7 +65,7 @@ PlistData buildLteIntraFrequencyRecord(const LteIntraFrequencyRecord& record, st
 
 PlistData buildLteIdleServingMeasurementRecord(const LteIdleServingMeasurementRecord& record,
                                                std::uint64_t timestamp) {
-    RecordBuilder builder(kLteIdleServingMeasurementCode, timestamp);
+    RecordBuilder builder(kLogCodeLteIdleServingMeasurement, timestamp);
     builder.u8(13, record.version)
         .u16(17, record.earfcn)
         .bits(19, 2, 0, 8, record.physicalCellId)
@@ -89,7 +89,7 @@ PlistData buildLteIdleServingMeasurementRecord(const LteIdleServingMeasurementRe
 
 PlistData buildLteIdleNeighbourMeasurementRecord(const LteIdleNeighbourMeasurementRecord& record,
                                                  std::uint64_t timestamp) {
-    RecordBuilder builder(kLteIdleNeighbourMeasurementCode, timestamp);
+    RecordBuilder builder(kLogCodeLteIdleNeighbourMeasurement, timestamp);
     const std::uint8_t countBits = record.countBitsOverride.value_or(
         record.neighbours.empty() ? 0 : static_cast<std::uint8_t>(record.neighbours.size() - 1));
     builder.u8(13, record.version)
@@ -116,7 +116,7 @@ PlistData buildLteIdleNeighbourMeasurementRecord(const LteIdleNeighbourMeasureme
 
 PlistData buildLteReselectionCandidatesRecord(const LteReselectionCandidatesRecord& record,
                                               std::uint64_t timestamp) {
-    RecordBuilder builder(kLteReselectionCandidatesCode, timestamp);
+    RecordBuilder builder(kLogCodeLteReselectionCandidates, timestamp);
     builder.u8(13, record.version)
         .u16(15, record.servingEarfcn)
         .u16(17, record.servingCellId)

@@ -19,16 +19,10 @@
 #include <string>
 #include <vector>
 
+#include "core/platform/logcodes/LteLogCodes.h"
 #include "core/platform/plist/PlistValue.h"
 
 namespace velmar {
-
-inline constexpr std::uint16_t kLteServingCellInfoCode = 0xB0C2;
-inline constexpr std::uint16_t kLteMasterInformationCode = 0xB0C1;
-inline constexpr std::uint16_t kLteIntraFrequencyCode = 0xB179;
-inline constexpr std::uint16_t kLteIdleServingMeasurementCode = 0xB17F;
-inline constexpr std::uint16_t kLteIdleNeighbourMeasurementCode = 0xB180;
-inline constexpr std::uint16_t kLteReselectionCandidatesCode = 0xB186;
 
 // 0xB0C2: the serving cell's identity and channels (38 bytes).
 struct LteServingCellInfoRecord {

@@ -1,6 +1,7 @@
 #include "logfile/records/RecordBuilder.h"
 
 #include "core/platform/RecordWriter.h"
+#include "core/platform/logcodes/ExtraLogCodes.h"
 #include "core/platform/plist/PlistCodec.h"
 
 namespace velmar {
@@ -54,7 +55,8 @@ PlistData buildExtendedPacket(std::uint16_t code, ByteView payload, std::uint64_
 
 PlistData buildCellMonitorPacket(const PlistValue& cells, std::uint64_t timestamp) {
     const auto serialised = serializeBinary(cells);
-    return buildExtendedPacket(0x0001, serialised ? ByteView(*serialised) : ByteView(), timestamp);
+    return buildExtendedPacket(extraPacketCode(kLogCodeCellMonitor),
+                               serialised ? ByteView(*serialised) : ByteView(), timestamp);
 }
 
 }  // namespace velmar

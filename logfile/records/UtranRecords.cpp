@@ -17,13 +17,13 @@ PlistData finish(RecordBuilder& builder, std::size_t layoutLength, std::size_t l
 }  // namespace
 
 PlistData buildUtranRrcStateRecord(const UtranRrcStateRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kUtranRrcStateCode, timestamp);
+    RecordBuilder builder(kLogCodeUtranRrcState, timestamp);
     builder.u8(13, record.modeValid).u8(14, record.mode);
     return finish(builder, 15, record.length);
 }
 
 PlistData buildUtranServingCellRecord(const UtranServingCellRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kUtranServingCellCode, timestamp);
+    RecordBuilder builder(kLogCodeUtranServingCell, timestamp);
     builder.u8(14, record.cellAccessRestrictions)
         .u8(15, record.uraId)
         .u16(17, record.uplinkUarfcn)
@@ -35,7 +35,7 @@ PlistData buildUtranServingCellRecord(const UtranServingCellRecord& record, std:
 
 PlistData buildUtranNeighbourMeasurementRecord(const UtranNeighbourMeasurementRecord& record,
                                                std::uint64_t timestamp) {
-    RecordBuilder builder(kUtranNeighbourMeasurementCode, timestamp);
+    RecordBuilder builder(kLogCodeUtranNeighbourMeasurement, timestamp);
     builder.bits(16, 1, 0, 0, record.byte16LowBit)
         .bits(16, 1, 1, 7,
               record.countOverride.value_or(static_cast<std::uint8_t>(record.neighbours.size())));
@@ -54,7 +54,7 @@ PlistData buildUtranNeighbourMeasurementRecord(const UtranNeighbourMeasurementRe
 
 PlistData buildUtranGsmNeighbourMeasurementRecord(const UtranGsmNeighbourMeasurementRecord& record,
                                                   std::uint64_t timestamp) {
-    RecordBuilder builder(kUtranGsmNeighbourMeasurementCode, timestamp);
+    RecordBuilder builder(kLogCodeUtranGsmNeighbourMeasurement, timestamp);
     builder.u8(16, record.countOverride.value_or(static_cast<std::uint8_t>(record.neighbours.size())));
     std::size_t at = 17;
     for (const UtranGsmNeighbour& cell : record.neighbours) {
@@ -71,7 +71,7 @@ PlistData buildUtranGsmNeighbourMeasurementRecord(const UtranGsmNeighbourMeasure
 }
 
 PlistData buildUtranChannelQualityRecord(const UtranChannelQualityRecord& record, std::uint64_t timestamp) {
-    RecordBuilder builder(kUtranChannelQualityCode, timestamp);
+    RecordBuilder builder(kLogCodeUtranChannelQuality, timestamp);
     const std::uint8_t transportCount =
         record.transportCountOverride.value_or(static_cast<std::uint8_t>(record.transportChannels.size()));
     builder.bits(14, 2, 6, 11, transportCount)

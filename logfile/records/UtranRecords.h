@@ -19,15 +19,10 @@
 #include <string>
 #include <vector>
 
+#include "core/platform/logcodes/UtranLogCodes.h"
 #include "core/platform/plist/PlistValue.h"
 
 namespace velmar {
-
-inline constexpr std::uint16_t kUtranRrcStateCode = 0xD0E0;
-inline constexpr std::uint16_t kUtranServingCellCode = 0xD0E2;
-inline constexpr std::uint16_t kUtranNeighbourMeasurementCode = 0xD00A;
-inline constexpr std::uint16_t kUtranGsmNeighbourMeasurementCode = 0xD00E;
-inline constexpr std::uint16_t kUtranChannelQualityCode = 0xD00C;
 
 // 0xD0E0: RRC state (15 bytes). The mode counts only when the valid byte is 1.
 struct UtranRrcStateRecord {

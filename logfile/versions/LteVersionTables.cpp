@@ -8,6 +8,7 @@
 // the scales below, e.g. quarter-dB RSRP = (raw - 640) / 4.
 #include <array>
 
+#include "core/platform/logcodes/LteLogCodes.h"
 #include "logfile/versions/VersionTables.h"
 
 namespace velmar::packet_versions {
@@ -250,19 +251,28 @@ constexpr VersionTable kNeighbourTables[] = {
 };
 
 constexpr CodeVersions kLteCodes[] = {
-    {.code = 0xB0C2, .place = VersionPlace::FirstByte, .decodedVersion = 2, .tables = kServingCellTables},
-    {.code = 0xB0C1,
+    {.code = kLogCodeLteServingCellInfo,
+     .place = VersionPlace::FirstByte,
+     .decodedVersion = 2,
+     .tables = kServingCellTables},
+    {.code = kLogCodeLteMasterInformation,
      .place = VersionPlace::FirstByte,
      .decodedVersion = 1,
      .tables = kMasterInformationTables},
-    {.code = 0xB179, .place = VersionPlace::FirstByte, .decodedVersion = 2, .tables = kIntraFrequencyTables},
-    {.code = 0xB17F,
+    {.code = kLogCodeLteIntraFrequency,
+     .place = VersionPlace::FirstByte,
+     .decodedVersion = 2,
+     .tables = kIntraFrequencyTables},
+    {.code = kLogCodeLteIdleServingMeasurement,
      .place = VersionPlace::FirstByte,
      .decodedVersion = 3,
      .tables = kServingMeasurementTables},
-    {.code = 0xB180, .place = VersionPlace::FirstByte, .decodedVersion = 3, .tables = kNeighbourTables},
+    {.code = kLogCodeLteIdleNeighbourMeasurement,
+     .place = VersionPlace::FirstByte,
+     .decodedVersion = 3,
+     .tables = kNeighbourTables},
     // Reselection candidates: no other layout is known.
-    {.code = 0xB186, .place = VersionPlace::FirstByte},
+    {.code = kLogCodeLteReselectionCandidates, .place = VersionPlace::FirstByte},
 };
 
 }  // namespace

@@ -1,5 +1,7 @@
 // The newer layouts of GSM/UMTS and NAS records, rewritten into the layouts the GSM/UMTS decoders read.
 // Payload offsets (packet offset minus 13).
+#include "core/platform/logcodes/CdmaLogCodes.h"
+#include "core/platform/logcodes/GsmLogCodes.h"
 #include "logfile/versions/VersionTables.h"
 
 namespace velmar::packet_versions {
@@ -135,11 +137,14 @@ constexpr VersionTable kEquivalentPlmnTables[] = {
 };
 
 constexpr CodeVersions kOtherCodes[] = {
-    {.code = 0x4005, .place = VersionPlace::TopBitsOfFirst, .decodedVersion = 0, .tables = kRankingTables},
-    {.code = 0x7150, .place = VersionPlace::None, .tables = kEquivalentPlmnTables},
+    {.code = kLogCodeUmtsIdleMeasurements,
+     .place = VersionPlace::TopBitsOfFirst,
+     .decodedVersion = 0,
+     .tables = kRankingTables},
+    {.code = kLogCodeEquivalentPlmns, .place = VersionPlace::None, .tables = kEquivalentPlmnTables},
     // Version fields of records with no other known layout.
-    {.code = 0x4221, .place = VersionPlace::FirstByte},
-    {.code = 0x134F, .place = VersionPlace::FirstByte},
+    {.code = kLogCodeUmtsHsdpa, .place = VersionPlace::FirstByte},
+    {.code = kLogCodeCdma1xSystemIdentity, .place = VersionPlace::FirstByte},
 };
 
 }  // namespace

@@ -149,7 +149,7 @@ void LteEmitter::step(const RadioSnapshot& snapshot, const BlobOutput& emit) {
 void LteEmitter::emitServingCellInfo(const RadioSnapshot& snapshot, const BlobOutput& emit) {
     const SimCell& cell = snapshot.cells[static_cast<std::size_t>(snapshot.servingCell)];
     LteServingCellInfoRecord info;
-    info.version = decodedVersion(kLteServingCellInfoCode);
+    info.version = decodedVersion(kLogCodeLteServingCellInfo);
     info.physicalCellId = static_cast<std::uint16_t>(cell.physicalId);
     info.downlinkEarfcn = static_cast<std::uint16_t>(cell.channel);
     info.uplinkEarfcn = static_cast<std::uint16_t>(cell.channel + 18000);  // the band's duplex spacing
@@ -162,7 +162,7 @@ void LteEmitter::emitServingCellInfo(const RadioSnapshot& snapshot, const BlobOu
     send(buildLteServingCellInfoRecord(info, snapshot.basebandTimestamp), emit);
 
     LteMasterInformationRecord master;
-    master.version = decodedVersion(kLteMasterInformationCode);
+    master.version = decodedVersion(kLogCodeLteMasterInformation);
     master.physicalCellId = info.physicalCellId;
     master.earfcn = info.downlinkEarfcn;
     master.numTxAntennas = 2;
@@ -174,7 +174,7 @@ void LteEmitter::emitIntraFrequency(const RadioSnapshot& snapshot, const BlobOut
     const SimCell& cell = snapshot.cells[static_cast<std::size_t>(snapshot.servingCell)];
     const CellLevels& serving = levels_[static_cast<std::size_t>(snapshot.servingCell)];
     LteIntraFrequencyRecord record;
-    record.version = decodedVersion(kLteIntraFrequencyCode);
+    record.version = decodedVersion(kLogCodeLteIntraFrequency);
     record.earfcn = static_cast<std::uint16_t>(cell.channel);
     record.servingPhysicalCellId = static_cast<std::uint16_t>(cell.physicalId);
     // System frame number × 10 + subframe, which wraps at 10240 ms.
@@ -218,7 +218,7 @@ void LteEmitter::emitIdleServing(const RadioSnapshot& snapshot, const BlobOutput
     const double srxlev = serving.rsrp - kQrxlevminDbm;
 
     LteIdleServingMeasurementRecord record;
-    record.version = decodedVersion(kLteIdleServingMeasurementCode);
+    record.version = decodedVersion(kLogCodeLteIdleServingMeasurement);
     record.earfcn = static_cast<std::uint16_t>(cell.channel);
     record.physicalCellId = static_cast<std::uint16_t>(cell.physicalId);
     record.servingLayerPriority = 5;
@@ -244,7 +244,7 @@ void LteEmitter::emitIdleNeighbours(const RadioSnapshot& snapshot, const BlobOut
     measure(snapshot);
     const SimCell& cell = snapshot.cells[static_cast<std::size_t>(snapshot.servingCell)];
     LteIdleNeighbourMeasurementRecord record;
-    record.version = decodedVersion(kLteIdleNeighbourMeasurementCode);
+    record.version = decodedVersion(kLogCodeLteIdleNeighbourMeasurement);
     record.earfcn = static_cast<std::uint16_t>(cell.channel);
     record.qrxlevmin = static_cast<std::uint8_t>((kQrxlevminDbm + 140) / 2);
     for (const HeardCell& heard : snapshot.heard) {

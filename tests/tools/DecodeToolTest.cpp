@@ -118,6 +118,97 @@ TEST(DecodeTool, StartCommandIsPrintedAsJson) {
     EXPECT_TRUE(command->dictionary()->get("SetKxExtraCodes").isArray());
 }
 
+TEST(DecodeTool, ListDecodersPrintsTheUtranClassIndexInDispatchOrder) {
+    const auto result = runProcess({kDecode, "--technology", "utran", "--list-decoders"});
+    ASSERT_EQ(result.exitCode, 0) << result.err;
+    EXPECT_EQ(result.out,
+              "code      decoder                     section\n"
+              "0xD0E0    RRC_State                   RRC Info\n"
+              "0xD0E2    UTRANServingCellInfo        Serving Cell Info\n"
+              "0xFF0001  UTRANServingCellInfo        Serving Cell Info\n"
+              "0xD00A    UTRANNeighbhorMeasurements  Neighbor Cell List\n"
+              "0xD00E    GSMNeighbhorMeasurements    GSM Neighbor Cell List\n"
+              "0xD00C    TRCHBLERMeasurement         TRCH BLER\n"
+              "0xD00C    CCTRCHSIRMeasurement        CCTRCH SIR\n"
+              "0xFF0002  PDPContextList              PDP Context Info\n"
+              "0xFF0000  SimInfo                     SIM Info\n");
+    EXPECT_EQ(result.err, "");
+}
+
+TEST(DecodeTool, ListDecodersPrintsTheLteClassIndexInDispatchOrder) {
+    const auto result = runProcess({kDecode, "--technology", "lte", "--list-decoders"});
+    ASSERT_EQ(result.exitCode, 0) << result.err;
+    EXPECT_EQ(result.out,
+              "code      decoder                       section\n"
+              "0xB0C2    LTEServingCellInfo            Serving Cell Info\n"
+              "0xB0C1    LTEServingCellInfo            Serving Cell Info\n"
+              "0xFF0001  LTEServingCellInfo            Serving Cell Info\n"
+              "0xB179    ConnectedModeMeasurementMisc  Connected mode LTE Intra-frequency Measurement\n"
+              "0xB179    MeasuredNeighborCells         Measured Neighbor Cells\n"
+              "0xB179    DetectedCells                 Detected Cells\n"
+              "0xB17F    ServingCellMeasurement        Serving Cell Measurements\n"
+              "0xB180    NeighborMeasurementMisc       Neighbor Measurements\n"
+              "0xB180    NeighborCellsList             Neighbor Cells List\n"
+              "0xB186    ReselectionCandidatesMisc     Reselection Candidates\n"
+              "0xB186    ReselectionCandidatesList     Reselection Candidates List\n"
+              "0xFF0000  SimInfo                       SIM Info\n"
+              "0xFF0002  PDPContextList                PDP Context Info\n");
+}
+
+TEST(DecodeTool, ListDecodersShowsTheSharedGsmCodesAndThePlaceholdersLast) {
+    const auto result = runProcess({kDecode, "--technology", "gsm", "--list-decoders"});
+    ASSERT_EQ(result.exitCode, 0) << result.err;
+    const auto printed = lines(result.out);
+    // The heading, 45 subscriptions of the 21 decoders with codes, and the 5 placeholders.
+    ASSERT_EQ(printed.size(), 1u + 45u + 5u);
+    EXPECT_EQ(printed[0], "code      decoder             section");
+    EXPECT_EQ(printed[1], "0x417A    ActiveSet           Active Set");
+    EXPECT_EQ(printed[4], "0x417A    VirtualActiveSet    Virtual Active Set");
+    std::vector<std::string> cellMonitor;
+    for (const std::string& line : printed) {
+        if (line.rfind("0xFF0001", 0) == 0) {
+            cellMonitor.push_back(line);
+        }
+    }
+    EXPECT_EQ(cellMonitor, (std::vector<std::string>{
+                               "0xFF0001  GSMServingCell      GSM Serving Cell",
+                               "0xFF0001  NeighboringCells    Neighboring Cells",
+                               "0xFF0001  ServingPLMN         Serving PLMN",
+                               "0xFF0001  UMTSSet             UMTS Set",
+                               "0xFF0001  UMTSRRInfo          UMTS RR Info",
+                           }));
+    EXPECT_EQ(std::vector<std::string>(printed.end() - 5, printed.end()),
+              (std::vector<std::string>{
+                  "none      CodingScheme        Coding Scheme",
+                  "none      UMTSRRMeasurement   UMTS RR Measurement",
+                  "none      CellChangeCounters  Cell Change Counters",
+                  "none      NonRankedGSMSet     Non-Ranked GSM Set",
+                  "none      NonRankedUMTSSet    Non-Ranked UMTS Set",
+              }));
+}
+
+TEST(DecodeTool, ListDecodersPrintsTheCdmaParserTable) {
+    const auto result = runProcess({kDecode, "--technology", "cdma", "--list-decoders"});
+    ASSERT_EQ(result.exitCode, 0) << result.err;
+    EXPECT_EQ(result.out,
+              "code    decoder\n"
+              "0x108A  parseFingerC2I\n"
+              "0x1183  parseEvdoStatus\n"
+              "0x1192  parseForwardLinkRate\n"
+              "0x12B6  parseEvdoActiveSet\n"
+              "0x119C  parse1xStatus\n"
+              "0x119D  parse1xTrafficFrameErrors\n"
+              "0x127E  parseReverseLinkRate\n"
+              "0x134F  parse1xSystemIdentity\n");
+}
+
+TEST(DecodeTool, ListDecodersOfTheObjectBasedTechnologyIsAnError) {
+    const auto result = runProcess({kDecode, "--technology", "ifx", "--list-decoders"});
+    EXPECT_EQ(result.exitCode, 2);
+    EXPECT_EQ(result.out, "");
+    EXPECT_EQ(result.err, "velmar-decode: technology 'ifx' dispatches no log codes\n");
+}
+
 TEST(DecodeTool, EveryTickPrintsOneLinePerRefresh) {
     const auto result =
         runProcess({kDecode, "--technology", "lte", "--every-tick", dataFile("two-intervals.hex")});

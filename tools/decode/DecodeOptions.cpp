@@ -95,6 +95,12 @@ CommandLine decodeCommandLine(DecodeOptions& options) {
          .value = "",
          .help = "print the generator's start command and exit (no FILE needed)",
          .apply = setsFlag(options.startCommand)},
+        {.name = "--list-decoders",
+         .value = "",
+         .help =
+             "print which decoder handles which log code, taken from the technology's class index, and exit "
+             "(no FILE needed)",
+         .apply = setsFlag(options.listDecoders)},
         logStderrOption(options.logStderr),
     };
     return commandLine;
@@ -124,7 +130,7 @@ std::optional<DecodeOptions> parseDecodeOptions(const std::vector<std::string>& 
         error = "--technology is required (" + technologyNameList(", ", " or ") + ")";
         return std::nullopt;
     }
-    if (options.files.empty() && !options.startCommand) {
+    if (options.files.empty() && !options.startCommand && !options.listDecoders) {
         error = "no input file given";
         return std::nullopt;
     }

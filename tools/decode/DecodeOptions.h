@@ -20,6 +20,7 @@ struct DecodeOptions {
     bool everyTick = false;
     bool saveContents = false;
     bool startCommand = false;
+    bool listDecoders = false;
     bool rawVersions = false;  // hand records on as recorded, without the packet-version adapter
     bool census = false;       // print the packet-version census instead of the display
     bool logStderr = false;

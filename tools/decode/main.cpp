@@ -1,17 +1,20 @@
 // velmar-decode: feeds recorded baseband blobs through the packet-version adapter and a technology's
 // generator, exactly as the service and the monitor's model do, and prints the display (or the whole state,
-// or the save contents) as JSON, or the adapter's census.
+// or the save contents) as JSON, or the adapter's census or the decoder map.
 //
 // Standard output carries that only (StandardOutputDiversion): the generator family's own lines go to
 // standard error with --log-stderr, like the log lines, and nowhere otherwise, so that a failure prints one
 // line only.
+#include <algorithm>
 #include <cstdio>
 #include <memory>
+#include <optional>
 #include <set>
 #include <string>
 #include <utility>
 #include <vector>
 
+#include "LogGenerator/DecoderMap.h"
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/BasebandPacket.h"
@@ -32,7 +35,7 @@ namespace {
 constexpr int kExitUsageOrInput = 2;
 constexpr int kPrettyIndent = 2;
 
-// Standard output: JSON documents, or the census's lines.
+// Standard output: JSON documents, or the lines of the census or the decoder map.
 class StandardOutput {
   public:
     explicit StandardOutput(bool diagnosticsToStderr) : diversion_(diagnosticsToStderr) {}
@@ -82,6 +85,49 @@ void reportCaptureStatistics(const std::string& path, const LogReadStats& stats)
     }
 }
 
+std::string codeText(const std::optional<std::int32_t>& code) {
+    char text[16];
+    if (!code) {
+        return "none";
+    }
+    std::snprintf(text, sizeof text, "0x%04X", static_cast<unsigned>(*code));
+    return text;
+}
+
+// One line per code and decoder, in dispatch order, in aligned columns; the section column only when some
+// decoder fills a section of its own.
+std::vector<std::string> decoderListing(const std::vector<DecoderMapEntry>& map) {
+    const bool withSections = std::any_of(
+        map.begin(), map.end(), [](const DecoderMapEntry& entry) { return !entry.section.empty(); });
+    std::vector<std::vector<std::string>> rows{{"code", "decoder"}};
+    for (const DecoderMapEntry& entry : map) {
+        rows.push_back({codeText(entry.code), entry.decoder});
+    }
+    if (withSections) {
+        rows[0].push_back("section");
+        for (std::size_t i = 0; i < map.size(); ++i) {
+            rows[i + 1].push_back(map[i].section);
+        }
+    }
+    std::vector<std::size_t> widths(rows[0].size(), 0);
+    for (const auto& row : rows) {
+        for (std::size_t column = 0; column < row.size(); ++column) {
+            widths[column] = std::max(widths[column], row[column].size());
+        }
+    }
+    std::vector<std::string> lines;
+    for (const auto& row : rows) {
+        std::string& line = lines.emplace_back();
+        for (std::size_t column = 0; column < row.size(); ++column) {
+            line += row[column];
+            if (column + 1 < row.size()) {
+                line.append(widths[column] - row[column].size() + 2, ' ');
+            }
+        }
+    }
+    return lines;
+}
+
 // Whether the generator's start command subscribes to a log code (extra codes count from 0xFF0000).
 DecodedCodes codesOfStartCommand(const PlistValue& command) {
     auto codes = std::make_shared<std::set<std::int32_t>>();
@@ -111,6 +157,14 @@ int run(const DecodeOptions& options) {
     }
     if (options.startCommand) {
         json.write(generator->getStartCommand(), 0);
+        return 0;
+    }
+    if (options.listDecoders) {
+        const std::optional<std::vector<DecoderMapEntry>> map = decoderMapOf(*generator);
+        if (!map) {
+            return fail("technology '" + options.technology + "' dispatches no log codes");
+        }
+        json.writeLines(decoderListing(*map));
         return 0;
     }
 
