@@ -1,17 +1,18 @@
 #include "LogGenerator/GSM/BLER.h"
 
 #include "LogGenerator/GSM/CountedList.h"
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeUmtsBlockErrors, 16},
 };
+constexpr DecoderRules kDecoderRules{"BLER", kRules};
 
 constexpr RecordField kWindowFields[] = {
     u16Field(14, "Window Size"),
@@ -31,9 +32,10 @@ constexpr std::size_t kEntryLength = 9;
 }  // namespace
 
 BLER::BLER() : TableDecoder(rowOf<BLER>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<BLER>(kGsmDecoders)));
 
 void BLER::updateWithData(ByteView data, std::int32_t logCode) {
-    if (gsm::admitRecord("BLER", kRules, data, logCode) == nullptr) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

@@ -1,16 +1,16 @@
 #include "LogGenerator/GSM/CellSetDecoder.h"
 
 #include "LogGenerator/GSM/CellSetRecord.h"
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/RecordFields.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeUmtsCellSets, CellSetRecord::kMinimumLength},
 };
 
@@ -36,7 +36,8 @@ PlistDictionaryRef activeCellRow(const CellSetRecord& record, std::size_t index,
 }  // namespace
 
 void CellSetDecoder::updateWithData(ByteView data, std::int32_t logCode) {
-    if (gsm::admitRecord(row().decoder, kRules, data, logCode) == nullptr) {
+    // Each of the four logs its own class name.
+    if (admitRecord(DecoderRules{row().decoder, kRules}, data, logCode) == nullptr) {
         return;
     }
     const PlistArrayRef section = sectionArray();
@@ -56,8 +57,12 @@ void CellSetDecoder::updateWithData(ByteView data, std::int32_t logCode) {
 }
 
 ActiveSet::ActiveSet() : CellSetDecoder(rowOf<ActiveSet>(kGsmDecoders), true) {}
+static_assert(rulesMatch(kRules, rowOf<ActiveSet>(kGsmDecoders)));
 DetectedSet::DetectedSet() : CellSetDecoder(rowOf<DetectedSet>(kGsmDecoders), false) {}
+static_assert(rulesMatch(kRules, rowOf<DetectedSet>(kGsmDecoders)));
 MonitoredSet::MonitoredSet() : CellSetDecoder(rowOf<MonitoredSet>(kGsmDecoders), false) {}
+static_assert(rulesMatch(kRules, rowOf<MonitoredSet>(kGsmDecoders)));
 VirtualActiveSet::VirtualActiveSet() : CellSetDecoder(rowOf<VirtualActiveSet>(kGsmDecoders), false) {}
+static_assert(rulesMatch(kRules, rowOf<VirtualActiveSet>(kGsmDecoders)));
 
 }  // namespace velmar

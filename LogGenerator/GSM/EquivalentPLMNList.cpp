@@ -3,7 +3,7 @@
 #include <optional>
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/StringFormat.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
@@ -11,9 +11,10 @@ namespace velmar {
 
 namespace {
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeEquivalentPlmns, 17},
 };
+constexpr DecoderRules kDecoderRules{"Equivalent PLMN List", kRules};
 
 constexpr std::size_t kCountOffset = 16;
 constexpr std::size_t kFirstEntryOffset = 17;
@@ -44,9 +45,10 @@ PlistDictionaryRef plmnRow(const RecordReader& record, std::size_t at) {
 }  // namespace
 
 EquivalentPLMNList::EquivalentPLMNList() : TableDecoder(rowOf<EquivalentPLMNList>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<EquivalentPLMNList>(kGsmDecoders)));
 
 void EquivalentPLMNList::updateWithData(ByteView data, std::int32_t logCode) {
-    if (gsm::admitRecord("Equivalent PLMN List", kRules, data, logCode) == nullptr) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const PlistArrayRef section = sectionArray();

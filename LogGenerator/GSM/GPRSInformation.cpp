@@ -1,7 +1,7 @@
 #include "LogGenerator/GSM/GPRSInformation.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
@@ -87,7 +87,7 @@ constexpr RecordField kHysteresisFields[] = {
     u8Field(26, "Cell Reselect Hysteresis", asName(kCellReselectHysteresisNames)),
 };
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeGprsCellOptions, 18, kCellOptionFields},
     {kLogCodeRegistrationInfo, 32, kRegistrationFields},
     {kLogCodeGprsTbfParameters, 24, kTbfFields},
@@ -96,14 +96,16 @@ constexpr gsm::RecordRule kRules[] = {
     {kLogCodeGprsSi13Position, 15, kSi13Fields},
     {kLogCodeGsmMeasurements, 29, kHysteresisFields},
 };
+constexpr DecoderRules kDecoderRules{"GPRSInformation", kRules};
 
 }  // namespace
 
 GPRSInformation::GPRSInformation() : TableDecoder(rowOf<GPRSInformation>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<GPRSInformation>(kGsmDecoders)));
 
 void GPRSInformation::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const gsm::RecordRule* rule = gsm::admitRecord("GPRSInformation", kRules, data, logCode)) {
-        gsm::writeRuleFields(*rule, data, sectionDictionary().get());
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

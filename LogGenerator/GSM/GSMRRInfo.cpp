@@ -1,7 +1,7 @@
 #include "LogGenerator/GSM/GSMRRInfo.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
@@ -67,20 +67,22 @@ constexpr RecordField kDrxFields[] = {
     u8Field(16, "DRX Used", asInt("%d sec")),
 };
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeGsmRrState, 17, kRrStateFields},
     {kLogCodeGsmMeasurements, 29, kServingMeasurementFields},
     {kLogCodeGsmChannelParameters, 20, kChannelFields},
     {kLogCodeGprsTbfParameters, 24, kDrxFields},
 };
+constexpr DecoderRules kDecoderRules{"GSMRRInfo", kRules};
 
 }  // namespace
 
 GSMRRInfo::GSMRRInfo() : TableDecoder(rowOf<GSMRRInfo>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<GSMRRInfo>(kGsmDecoders)));
 
 void GSMRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const gsm::RecordRule* rule = gsm::admitRecord("GSMRRInfo", kRules, data, logCode)) {
-        gsm::writeRuleFields(*rule, data, sectionDictionary().get());
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

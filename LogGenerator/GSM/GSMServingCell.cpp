@@ -2,14 +2,13 @@
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
-
-using gsm::RecordRule;
 
 constexpr RecordField kIdentityFields[] = {
     u16Field(17, "Cell ID"),
@@ -36,6 +35,7 @@ constexpr RecordRule kRules[] = {
     {kLogCodeGsmDedicatedChannel, 17, kDedicatedChannelFields},
     {kLogCodeCellMonitor, 0},
 };
+constexpr DecoderRules kDecoderRules{"GSMServingCell", kRules};
 
 void showServingCell(ByteView data, PlistDictionary* section) {
     const PlistDictionaryRef cell =
@@ -52,9 +52,10 @@ void showServingCell(ByteView data, PlistDictionary* section) {
 }  // namespace
 
 GSMServingCell::GSMServingCell() : TableDecoder(rowOf<GSMServingCell>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<GSMServingCell>(kGsmDecoders)));
 
 void GSMServingCell::updateWithData(ByteView data, std::int32_t logCode) {
-    const RecordRule* rule = gsm::admitRecord("GSMServingCell", kRules, data, logCode);
+    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
     if (rule == nullptr) {
         return;
     }
@@ -62,7 +63,7 @@ void GSMServingCell::updateWithData(ByteView data, std::int32_t logCode) {
     if (rule->code == kLogCodeCellMonitor) {
         showServingCell(data, section.get());
     } else {
-        gsm::writeRuleFields(*rule, data, section.get());
+        writeRuleFields(*rule, data, section.get());
     }
 }
 

@@ -1,17 +1,18 @@
 #include "LogGenerator/GSM/GSMSet.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/GSM/RecordRows.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeUmtsIdleMeasurements, 15},
 };
+constexpr DecoderRules kDecoderRules{"GSMSet", kRules};
 
 constexpr RecordField kGsmCellFields[] = {
     u16Field(0, "ARFCN"),
@@ -25,9 +26,10 @@ constexpr RecordRowList kGsmCells{14, 15, 7, kGsmCellFields};
 }  // namespace
 
 GSMSet::GSMSet() : TableDecoder(rowOf<GSMSet>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<GSMSet>(kGsmDecoders)));
 
 void GSMSet::updateWithData(ByteView data, std::int32_t logCode) {
-    if (gsm::admitRecord("GSMSet", kRules, data, logCode) == nullptr) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     showRecordRows(kGsmCells, RecordReader(data), sectionArray());

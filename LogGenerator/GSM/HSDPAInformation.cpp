@@ -1,17 +1,19 @@
 #include "LogGenerator/GSM/HSDPAInformation.h"
 
 #include "LogGenerator/GSM/CountedList.h"
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeUmtsHsdpa, 18},
 };
+// Unlike most decoders, an unexpected code is ignored without a message.
+constexpr DecoderRules kDecoderRules{"HSDPA Info", kRules, DecoderRules::OtherCodes::Ignored};
 
 constexpr ValueName kCarrierRows[] = {
     {0, 0, "Single Carrier"},
@@ -56,12 +58,10 @@ PlistArrayRef harqProcessRows(const RecordReader& record, const CountedList& lis
 }  // namespace
 
 HSDPAInformation::HSDPAInformation() : TableDecoder(rowOf<HSDPAInformation>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<HSDPAInformation>(kGsmDecoders)));
 
 void HSDPAInformation::updateWithData(ByteView data, std::int32_t logCode) {
-    gsm::logDecoderEntry("HSDPA Info");
-    // Unlike the other decoders, an unexpected code is ignored without a message.
-    const gsm::RecordRule* rule = gsm::findRule(kRules, logCode);
-    if (rule == nullptr || data.size() < rule->minimumLength) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

@@ -1,18 +1,19 @@
 #include "LogGenerator/GSM/MobileAllocation.h"
 
 #include "LogGenerator/GSM/CountedList.h"
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/RecordFields.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
 
 namespace {
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeGsmMobileAllocation, 15},
 };
+constexpr DecoderRules kDecoderRules{"MobileAllocation", kRules};
 
 constexpr RecordField kAllocationFields[] = {
     u8Field(13, "HSN"),
@@ -27,9 +28,10 @@ constexpr RecordField kArfcn = u16Field(0, "ARFCN");
 }  // namespace
 
 MobileAllocation::MobileAllocation() : TableDecoder(rowOf<MobileAllocation>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<MobileAllocation>(kGsmDecoders)));
 
 void MobileAllocation::updateWithData(ByteView data, std::int32_t logCode) {
-    if (gsm::admitRecord("MobileAllocation", kRules, data, logCode) == nullptr) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

@@ -5,7 +5,7 @@
 
 #include "LogGenerator/GSM/CellMonitorWalk.h"
 #include "LogGenerator/GSM/CountedList.h"
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
@@ -13,11 +13,12 @@ namespace velmar {
 
 namespace {
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeGsmMeasurements, 29},
     {kLogCodeGsmBsicList, 15},
     {kLogCodeCellMonitor, 0},
 };
+constexpr DecoderRules kDecoderRules{"NeighboringCells", kRules};
 
 // 0x51FF: count at 14, 4-byte elements from 15: ARFCN (2 bytes), BSIC (1 byte), one unused byte.
 constexpr std::size_t kBsicCountOffset = 14;
@@ -45,9 +46,10 @@ constexpr NeighbourCellField kNeighbourCellFields[] = {
 }  // namespace
 
 NeighboringCells::NeighboringCells() : TableDecoder(rowOf<NeighboringCells>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<NeighboringCells>(kGsmDecoders)));
 
 void NeighboringCells::updateWithData(ByteView data, std::int32_t logCode) {
-    const gsm::RecordRule* rule = gsm::admitRecord("NeighboringCells", kRules, data, logCode);
+    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
     if (rule == nullptr) {
         return;
     }

@@ -1,6 +1,6 @@
 #include "LogGenerator/GSM/PDPContextList.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/plist/PlistCodec.h"
 
 namespace velmar {
@@ -22,7 +22,7 @@ PlistArrayRef parseContexts(ByteView record) {
 PDPContextList::PDPContextList() : TableDecoder(kPDPContextListRow) {}
 
 void PDPContextList::updateWithData(ByteView data, std::int32_t) {
-    gsm::logDecoderEntry("PDPContextList");
+    logDecoderTitle("PDPContextList");
     if (const PlistArrayRef contexts = parseContexts(data)) {
         replaceArray(sectionArray(), contexts);
     }

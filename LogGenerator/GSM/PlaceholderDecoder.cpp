@@ -1,12 +1,12 @@
 #include "LogGenerator/GSM/PlaceholderDecoder.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 
 namespace velmar {
 
 void PlaceholderDecoder::updateWithData(ByteView, std::int32_t) {
-    gsm::logDecoderEntry(row().decoder);
+    logDecoderTitle(row().decoder);
 }
 
 CodingScheme::CodingScheme() : PlaceholderDecoder(rowOf<CodingScheme>(kGsmDecoders)) {}

@@ -1,8 +1,8 @@
 #include "LogGenerator/GSM/ProcessCO.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/MobilityStateNames.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
@@ -14,19 +14,21 @@ constexpr RecordField kMmFields[] = {
     u8Field(13, "MM State", asName(kMmStateNames)),
 };
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeMmState, kMobilityRecordMinimumLength, kMmFields},
     {kLogCodeRegistrationState, kMobilityRecordMinimumLength, kRegistrationStateFields},
 };
+// The common view logs the circuit-switched decoder's title, "ProcessCS", as its own.
+constexpr DecoderRules kDecoderRules{"ProcessCS", kRules};
 
 }  // namespace
 
 ProcessCO::ProcessCO() : TableDecoder(rowOf<ProcessCO>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<ProcessCO>(kGsmDecoders)));
 
 void ProcessCO::updateWithData(ByteView data, std::int32_t logCode) {
-    // The common view logs the circuit-switched decoder's title, "ProcessCS", as its own.
-    if (const gsm::RecordRule* rule = gsm::admitRecord("ProcessCS", kRules, data, logCode)) {
-        gsm::writeRuleFields(*rule, data, sectionDictionary().get());
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

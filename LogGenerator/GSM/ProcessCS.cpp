@@ -1,8 +1,8 @@
 #include "LogGenerator/GSM/ProcessCS.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/MobilityStateNames.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
@@ -16,18 +16,20 @@ constexpr RecordField kMmFields[] = {
     u8Field(15, "LU Reject Cause", asName(kLocationUpdateStatusNames)),
 };
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeMmState, kMobilityRecordMinimumLength, kMmFields},
     {kLogCodeRegistrationState, kMobilityRecordMinimumLength, kRegistrationStateFields},
 };
+constexpr DecoderRules kDecoderRules{"ProcessCS", kRules};
 
 }  // namespace
 
 ProcessCS::ProcessCS() : TableDecoder(rowOf<ProcessCS>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<ProcessCS>(kGsmDecoders)));
 
 void ProcessCS::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const gsm::RecordRule* rule = gsm::admitRecord("ProcessCS", kRules, data, logCode)) {
-        gsm::writeRuleFields(*rule, data, sectionDictionary().get());
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

@@ -1,8 +1,8 @@
 #include "LogGenerator/GSM/ProcessPS.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/MobilityStateNames.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
 namespace velmar {
@@ -16,18 +16,20 @@ constexpr RecordField kGmmFields[] = {
     u8Field(15, "Attach Reject Cause", asName(kGmmUpdateStatusNames)),
 };
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeGmmState, kMobilityRecordMinimumLength, kGmmFields},
     {kLogCodeRegistrationState, kMobilityRecordMinimumLength, kRegistrationStateFields},
 };
+constexpr DecoderRules kDecoderRules{"ProcessPS", kRules};
 
 }  // namespace
 
 ProcessPS::ProcessPS() : TableDecoder(rowOf<ProcessPS>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<ProcessPS>(kGsmDecoders)));
 
 void ProcessPS::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const gsm::RecordRule* rule = gsm::admitRecord("ProcessPS", kRules, data, logCode)) {
-        gsm::writeRuleFields(*rule, data, sectionDictionary().get());
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

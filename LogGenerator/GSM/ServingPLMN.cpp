@@ -2,6 +2,7 @@
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/StringFormat.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
@@ -34,11 +35,12 @@ constexpr RecordField kSelectionModeFields[] = {
     u8Field(14, "PLMN Sel Mod", asName(kSelectionModeNames)),
 };
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeRegistrationInfo, 32},
     {kLogCodeRegistrationState, 16, kSelectionModeFields},
     {kLogCodeCellMonitor, 0},
 };
+constexpr DecoderRules kDecoderRules{"Serving PLMN", kRules};
 
 // A BCD digit as a character: 0..9 as the digit, 10..15 (the filler 0xF among them) as a blank.
 char bcdDigit(std::uint32_t nibble) {
@@ -80,9 +82,10 @@ void writeServingCell(ByteView data, PlistDictionary* section) {
 }  // namespace
 
 ServingPLMN::ServingPLMN() : TableDecoder(rowOf<ServingPLMN>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<ServingPLMN>(kGsmDecoders)));
 
 void ServingPLMN::updateWithData(ByteView data, std::int32_t logCode) {
-    const gsm::RecordRule* rule = gsm::admitRecord("Serving PLMN", kRules, data, logCode);
+    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
     if (rule == nullptr) {
         return;
     }
@@ -95,7 +98,7 @@ void ServingPLMN::updateWithData(ByteView data, std::int32_t logCode) {
             writeServingCell(data, section.get());
             break;
         default:
-            gsm::writeRuleFields(*rule, data, section.get());
+            writeRuleFields(*rule, data, section.get());
             break;
     }
 }

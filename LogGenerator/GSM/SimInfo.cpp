@@ -1,8 +1,7 @@
 #include "LogGenerator/GSM/SimInfo.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/LogCode_0xFF0000.h"
-#include "core/platform/logcodes/GsmLogCodes.h"
+#include "LogGenerator/RecordRule.h"
 
 namespace velmar {
 
@@ -30,13 +29,18 @@ constexpr SimFileKey kSimFiles[] = {
     {"kSimFile_OPLMNAcT", "EF-OPLMNAcT"},
 };
 
+constexpr RecordRule kRules[] = {
+    {kLogCodeSimFiles, 0},
+};
+constexpr DecoderRules kDecoderRules{"SimInfo", kRules, DecoderRules::OtherCodes::Ignored};
+
 }  // namespace
 
 SimInfo::SimInfo() : TableDecoder(kSimInfoRow) {}
+static_assert(rulesMatch(kRules, kSimInfoRow));
 
 void SimInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    gsm::logDecoderEntry("SimInfo");
-    if (logCode != kLogCodeSimFiles) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     // Throws, before any key changes, when the record cannot be parsed.

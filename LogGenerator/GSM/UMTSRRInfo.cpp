@@ -2,6 +2,7 @@
 
 #include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/StringFormat.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
@@ -37,13 +38,14 @@ constexpr RecordField kCipheringFields[] = {
     u8Field(13, "Ciphering", asName(kCipheringNames)),
 };
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeUmtsRrcState, 14, kRrcStateFields},
     {kLogCodeUmtsTransmitPower, 16},
     {kLogCodeUmtsCellIdentity, 29},
     {kLogCodeUmtsCiphering, 19, kCipheringFields},
     {kLogCodeCellMonitor, 0},
 };
+constexpr DecoderRules kDecoderRules{"UMTSRRInfo", kRules};
 
 // 0x4031: the mean of the non-zero uplink power readings. With no such reading the mean is 0 / 0 and shows
 // as not-a-number; the display has always shown it so.
@@ -96,9 +98,10 @@ void writeServingCell(ByteView data, PlistDictionary* section) {
 }  // namespace
 
 UMTSRRInfo::UMTSRRInfo() : TableDecoder(rowOf<UMTSRRInfo>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<UMTSRRInfo>(kGsmDecoders)));
 
 void UMTSRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    const gsm::RecordRule* rule = gsm::admitRecord("UMTSRRInfo", kRules, data, logCode);
+    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
     if (rule == nullptr) {
         return;
     }
@@ -114,7 +117,7 @@ void UMTSRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
             writeServingCell(data, section.get());
             break;
         default:
-            gsm::writeRuleFields(*rule, data, section.get());
+            writeRuleFields(*rule, data, section.get());
             break;
     }
 }

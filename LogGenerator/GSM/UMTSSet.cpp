@@ -1,9 +1,9 @@
 #include "LogGenerator/GSM/UMTSSet.h"
 
 #include "LogGenerator/GSM/CellMonitorWalk.h"
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/GSM/RecordRows.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/logcodes/GsmLogCodes.h"
 
@@ -11,10 +11,11 @@ namespace velmar {
 
 namespace {
 
-constexpr gsm::RecordRule kRules[] = {
+constexpr RecordRule kRules[] = {
     {kLogCodeUmtsIdleMeasurements, 15},
     {kLogCodeCellMonitor, 0},
 };
+constexpr DecoderRules kDecoderRules{"UMTSSet", kRules};
 
 // Written in this key order, which is not the order of the fields in the entry.
 constexpr RecordField kUmtsCellFields[] = {
@@ -40,9 +41,10 @@ constexpr NeighbourCellField kNeighbourCellFields[] = {
 }  // namespace
 
 UMTSSet::UMTSSet() : TableDecoder(rowOf<UMTSSet>(kGsmDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<UMTSSet>(kGsmDecoders)));
 
 void UMTSSet::updateWithData(ByteView data, std::int32_t logCode) {
-    const gsm::RecordRule* rule = gsm::admitRecord("UMTSSet", kRules, data, logCode);
+    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
     if (rule == nullptr) {
         return;
     }

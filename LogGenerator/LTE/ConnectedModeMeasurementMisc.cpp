@@ -3,7 +3,7 @@
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
@@ -11,9 +11,6 @@ namespace velmar {
 namespace {
 
 using namespace lte_layout::intra_frequency;
-
-constexpr RecordPreamble kPreamble{"Connected mode LTE Intra-frequency Measurement",
-                                   kLogCodeLteIntraFrequency, kMinimumLength};
 
 constexpr RecordField kFields[] = {
     u16Field(17, "E-ARFCN"),
@@ -23,17 +20,18 @@ constexpr RecordField kFields[] = {
     u16Field(25, "Serving Filtered RSRQ", lte_formats::kEighthDbRsrq),
 };
 
+constexpr RecordRule kRules[] = {{kLogCodeLteIntraFrequency, kMinimumLength, kFields}};
+constexpr DecoderRules kDecoderRules{"Connected mode LTE Intra-frequency Measurement", kRules};
+
 }  // namespace
 
 ConnectedModeMeasurementMisc::ConnectedModeMeasurementMisc()
     : TableDecoder(rowOf<ConnectedModeMeasurementMisc>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<ConnectedModeMeasurementMisc>(kLteDecoders)));
 
 void ConnectedModeMeasurementMisc::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
-        return;
-    }
-    if (const PlistDictionaryRef section = sectionDictionary()) {
-        writeFields(kFields, RecordReader(data), 0, *section);
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

@@ -4,7 +4,7 @@
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
@@ -13,7 +13,8 @@ namespace {
 
 using namespace lte_layout::intra_frequency;
 
-constexpr RecordPreamble kPreamble{"Detected Cells", kLogCodeLteIntraFrequency, kMinimumLength};
+constexpr RecordRule kRules[] = {{kLogCodeLteIntraFrequency, kMinimumLength}};
+constexpr DecoderRules kDecoderRules{"Detected Cells", kRules};
 
 constexpr RecordField kEntryFields[] = {
     u16Field(0, "Physical Cell ID"),
@@ -22,9 +23,10 @@ constexpr RecordField kEntryFields[] = {
 }  // namespace
 
 DetectedCells::DetectedCells() : TableDecoder(rowOf<DetectedCells>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<DetectedCells>(kLteDecoders)));
 
 void DetectedCells::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

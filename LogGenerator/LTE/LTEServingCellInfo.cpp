@@ -3,7 +3,7 @@
 #include "LogGenerator/CellInfoArray.h"
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "LogGenerator/ServingCellWalk.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/logcodes/LteLogCodes.h"
@@ -12,9 +12,6 @@ namespace velmar {
 
 namespace {
 
-constexpr const char* kTitle = "LTE Serving Cell Info";
-constexpr std::size_t kServingCellInfoMinimum = 38;
-constexpr std::size_t kMasterInformationMinimum = 22;
 constexpr const char* kUarfcnKey = "UARFCN";
 
 constexpr ValueName kBandwidthRows[] = {
@@ -50,20 +47,28 @@ constexpr CellMonitorField kCellMonitorFields[] = {
     {kKxCellMonitorUARFCN, kUarfcnKey, nullptr, "Serving Cell Info: Failed to retrieve UARFCN\n"},
 };
 
+constexpr RecordRule kRules[] = {
+    {kLogCodeLteServingCellInfo, 38},
+    {kLogCodeLteMasterInformation, 22, kMasterInformation},
+    {kLogCodeCellMonitor, 0},
+};
+constexpr DecoderRules kDecoderRules{"LTE Serving Cell Info", kRules};
+
 }  // namespace
 
 LTEServingCellInfo::LTEServingCellInfo() : TableDecoder(rowOf<LTEServingCellInfo>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<LTEServingCellInfo>(kLteDecoders)));
 
 void LTEServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    logDecoderTitle(kTitle);
+    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
+    if (rule == nullptr) {
+        return;
+    }
     const PlistDictionaryRef section = sectionDictionary();
-    const RecordReader record(data);
-    switch (logCode) {
+    switch (rule->code) {
         case kLogCodeLteServingCellInfo: {
-            if (data.size() < kServingCellInfoMinimum) {
-                return;
-            }
             if (section) {
+                const RecordReader record(data);
                 writeFields(kServingCellChannels, record, 0, *section);
                 section->remove(kUarfcnKey);
                 writeFields(kServingCellIdentity, record, 0, *section);
@@ -71,18 +76,13 @@ void LTEServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
             return;
         }
         case kLogCodeLteMasterInformation: {
-            if (data.size() < kMasterInformationMinimum) {
-                return;
-            }
-            if (section) {
-                writeFields(kMasterInformation, record, 0, *section);
-            }
+            writeRuleFields(*rule, data, section.get());
             // Every good 0xB0C1 record is also reported as unknown; the line is part of the record's
             // handling.
             reportUnknownLogMessage(logCode);
             return;
         }
-        case kLogCodeCellMonitor: {
+        default: {
             const CellInfoArray cellInfo(data);
             if (cellInfo.holdsNothing()) {
                 SystemLog::log(kLogError, "Failed to get Cell Array\n");
@@ -92,9 +92,6 @@ void LTEServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
                                    ServingCellPick::FirstMatch, kCellMonitorFields, section.get());
             return;
         }
-        default:
-            reportUnknownLogMessage(logCode);
-            return;
     }
 }
 

@@ -4,7 +4,7 @@
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/ListSection.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
@@ -13,7 +13,8 @@ namespace {
 
 using namespace lte_layout::intra_frequency;
 
-constexpr RecordPreamble kPreamble{"Measured Neighbor Cells", kLogCodeLteIntraFrequency, kMinimumLength};
+constexpr RecordRule kRules[] = {{kLogCodeLteIntraFrequency, kMinimumLength}};
+constexpr DecoderRules kDecoderRules{"Measured Neighbor Cells", kRules};
 
 // Offsets within a measured-neighbour entry.
 constexpr RecordField kEntryFields[] = {
@@ -25,9 +26,10 @@ constexpr RecordField kEntryFields[] = {
 }  // namespace
 
 MeasuredNeighborCells::MeasuredNeighborCells() : TableDecoder(rowOf<MeasuredNeighborCells>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<MeasuredNeighborCells>(kLteDecoders)));
 
 void MeasuredNeighborCells::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

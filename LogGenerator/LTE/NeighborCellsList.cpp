@@ -4,7 +4,7 @@
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/ListSection.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
@@ -13,8 +13,8 @@ namespace {
 
 using namespace lte_layout::neighbor_measurement;
 
-constexpr RecordPreamble kPreamble{"Neighbor Cells List", kLogCodeLteIdleNeighbourMeasurement,
-                                   kMinimumLength};
+constexpr RecordRule kRules[] = {{kLogCodeLteIdleNeighbourMeasurement, kMinimumLength}};
+constexpr DecoderRules kDecoderRules{"Neighbor Cells List", kRules};
 
 // Offsets within a 20-byte neighbour entry. Every level is in half dB, RSRP included; the antenna-1 offsets
 // are read from the antenna-0 bits.
@@ -51,9 +51,10 @@ void traceEntry(const RecordReader& record, std::size_t base) {
 }  // namespace
 
 NeighborCellsList::NeighborCellsList() : TableDecoder(rowOf<NeighborCellsList>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<NeighborCellsList>(kLteDecoders)));
 
 void NeighborCellsList::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

@@ -3,7 +3,7 @@
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
@@ -12,26 +12,24 @@ namespace {
 
 using namespace lte_layout::neighbor_measurement;
 
-constexpr RecordPreamble kPreamble{"Neighbor Measurements", kLogCodeLteIdleNeighbourMeasurement,
-                                   kMinimumLength};
-
 constexpr RecordField kFields[] = {
     u8Field(13, "Version"),
     u16Field(17, "E-ARFCN"),
     bitField(19, 1, 0, 5, "Qrxlevmin", lte_formats::kQrxlevmin),
 };
 
+constexpr RecordRule kRules[] = {{kLogCodeLteIdleNeighbourMeasurement, kMinimumLength, kFields}};
+constexpr DecoderRules kDecoderRules{"Neighbor Measurements", kRules};
+
 }  // namespace
 
 NeighborMeasurementMisc::NeighborMeasurementMisc()
     : TableDecoder(rowOf<NeighborMeasurementMisc>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<NeighborMeasurementMisc>(kLteDecoders)));
 
 void NeighborMeasurementMisc::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
-        return;
-    }
-    if (const PlistDictionaryRef section = sectionDictionary()) {
-        writeFields(kFields, RecordReader(data), 0, *section);
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

@@ -6,7 +6,7 @@
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
@@ -15,8 +15,8 @@ namespace {
 
 using namespace lte_layout::reselection;
 
-constexpr RecordPreamble kPreamble{"Reselection Candidates List", kLogCodeLteReselectionCandidates,
-                                   kMinimumLength};
+constexpr RecordRule kRules[] = {{kLogCodeLteReselectionCandidates, kMinimumLength}};
+constexpr DecoderRules kDecoderRules{"Reselection Candidates List", kRules};
 
 constexpr ValueName kRatNameRows[] = {
     {0, 0, "LTE"}, {1, 1, "UTRAN"}, {2, 2, "GERAN"}, {3, 3, "CDMA1XRTT"}, {4, 4, "CDMAHRPD"},
@@ -58,9 +58,10 @@ constexpr std::span<const RecordField> kTechnologyFields[] = {kLteFields, kUtran
 
 ReselectionCandidatesList::ReselectionCandidatesList()
     : TableDecoder(rowOf<ReselectionCandidatesList>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<ReselectionCandidatesList>(kLteDecoders)));
 
 void ReselectionCandidatesList::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

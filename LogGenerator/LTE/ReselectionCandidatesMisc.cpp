@@ -3,7 +3,7 @@
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
@@ -12,26 +12,24 @@ namespace {
 
 using namespace lte_layout::reselection;
 
-constexpr RecordPreamble kPreamble{"Reselection Candidates", kLogCodeLteReselectionCandidates,
-                                   kMinimumLength};
-
 constexpr RecordField kFields[] = {
     u8Field(13, "Version"),
     u16Field(15, "Serving EARFCN"),
     u16Field(17, "Serving Cell ID"),
 };
 
+constexpr RecordRule kRules[] = {{kLogCodeLteReselectionCandidates, kMinimumLength, kFields}};
+constexpr DecoderRules kDecoderRules{"Reselection Candidates", kRules};
+
 }  // namespace
 
 ReselectionCandidatesMisc::ReselectionCandidatesMisc()
     : TableDecoder(rowOf<ReselectionCandidatesMisc>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<ReselectionCandidatesMisc>(kLteDecoders)));
 
 void ReselectionCandidatesMisc::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
-        return;
-    }
-    if (const PlistDictionaryRef section = sectionDictionary()) {
-        writeFields(kFields, RecordReader(data), 0, *section);
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

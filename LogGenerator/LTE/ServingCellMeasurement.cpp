@@ -3,7 +3,7 @@
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LteFormats.h"
 #include "LogGenerator/LTE/LteRecordLayouts.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
 namespace velmar {
@@ -11,9 +11,6 @@ namespace velmar {
 namespace {
 
 using namespace lte_layout::serving_measurement;
-
-constexpr RecordPreamble kPreamble{"Serving Cell Measurements", kLogCodeLteIdleServingMeasurement,
-                                   kMinimumLength};
 
 constexpr const char* kNotPresent = "Not Present";
 
@@ -42,17 +39,18 @@ constexpr RecordField kFields[] = {
     bitField(32, 1, 2, 5, "Measurement Rules"),
 };
 
+constexpr RecordRule kRules[] = {{kLogCodeLteIdleServingMeasurement, kMinimumLength, kFields}};
+constexpr DecoderRules kDecoderRules{"Serving Cell Measurements", kRules};
+
 }  // namespace
 
 ServingCellMeasurement::ServingCellMeasurement()
     : TableDecoder(rowOf<ServingCellMeasurement>(kLteDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<ServingCellMeasurement>(kLteDecoders)));
 
 void ServingCellMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
-        return;
-    }
-    if (const PlistDictionaryRef section = sectionDictionary()) {
-        writeFields(kFields, RecordReader(data), 0, *section);
+    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
+        writeRuleFields(*rule, data, sectionDictionary().get());
     }
 }
 

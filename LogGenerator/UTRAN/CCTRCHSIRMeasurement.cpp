@@ -2,7 +2,7 @@
 
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "LogGenerator/UTRAN/UtranRecordLayouts.h"
 #include "core/platform/StringFormat.h"
@@ -14,8 +14,8 @@ namespace {
 
 using namespace utran_layout::channel_quality;
 
-constexpr RecordPreamble kPreamble{"CCTRCH SIR Measurement", kLogCodeUtranChannelQuality, kMinimumLength,
-                                   RecordPreamble::OtherCodes::Ignored};
+constexpr RecordRule kRules[] = {{kLogCodeUtranChannelQuality, kMinimumLength}};
+constexpr DecoderRules kDecoderRules{"CCTRCH SIR Measurement", kRules, DecoderRules::OtherCodes::Ignored};
 
 constexpr RecordField kEntryFields[] = {
     u8Field(0, "CCTRCH ID"),
@@ -38,9 +38,10 @@ PlistValue compositeChannelRow(const RecordReader& record, std::size_t base) {
 }  // namespace
 
 CCTRCHSIRMeasurement::CCTRCHSIRMeasurement() : TableDecoder(rowOf<CCTRCHSIRMeasurement>(kUtranDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<CCTRCHSIRMeasurement>(kUtranDecoders)));
 
 void CCTRCHSIRMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

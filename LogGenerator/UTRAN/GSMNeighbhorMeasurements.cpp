@@ -1,7 +1,7 @@
 #include "LogGenerator/UTRAN/GSMNeighbhorMeasurements.h"
 
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "core/platform/logcodes/UtranLogCodes.h"
 
@@ -9,8 +9,8 @@ namespace velmar {
 
 namespace {
 
-constexpr RecordPreamble kPreamble{"GSM Neighbor Cell List", kLogCodeUtranGsmNeighbourMeasurement, 17,
-                                   RecordPreamble::OtherCodes::Ignored};
+constexpr RecordRule kRules[] = {{kLogCodeUtranGsmNeighbourMeasurement, 17}};
+constexpr DecoderRules kDecoderRules{"GSM Neighbor Cell List", kRules, DecoderRules::OtherCodes::Ignored};
 
 constexpr std::size_t kCountOffset = 16;
 constexpr std::size_t kEntriesOffset = 17;
@@ -30,9 +30,10 @@ constexpr RecordField kEntryFields[] = {
 
 GSMNeighbhorMeasurements::GSMNeighbhorMeasurements()
     : TableDecoder(rowOf<GSMNeighbhorMeasurements>(kUtranDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<GSMNeighbhorMeasurements>(kUtranDecoders)));
 
 void GSMNeighbhorMeasurements::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     clearElementsInArray(sectionArray());

@@ -4,7 +4,7 @@
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "core/platform/Json.h"
 #include "core/platform/logcodes/UtranLogCodes.h"
 
@@ -14,7 +14,8 @@ namespace {
 
 constexpr std::size_t kExpectedLength = 15;
 // The length is only reported, never enforced.
-constexpr RecordPreamble kPreamble{"RRC Info", kLogCodeUtranRrcState, 0, RecordPreamble::OtherCodes::Ignored};
+constexpr RecordRule kRules[] = {{kLogCodeUtranRrcState, 0}};
+constexpr DecoderRules kDecoderRules{"RRC Info", kRules, DecoderRules::OtherCodes::Ignored};
 
 constexpr std::size_t kModeValidOffset = 13;
 constexpr std::size_t kModeOffset = 14;
@@ -29,9 +30,10 @@ constexpr ValueNames kStateNames{kStateRows, "Unknown RRC Mode"};
 }  // namespace
 
 RRC_State::RRC_State() : TableDecoder(rowOf<RRC_State>(kUtranDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<RRC_State>(kUtranDecoders)));
 
 void RRC_State::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     if (data.size() < kExpectedLength) {

@@ -2,7 +2,7 @@
 
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "LogGenerator/UTRAN/UtranRecordLayouts.h"
 #include "core/platform/logcodes/UtranLogCodes.h"
@@ -13,8 +13,9 @@ namespace {
 
 using namespace utran_layout::channel_quality;
 
-constexpr RecordPreamble kPreamble{"TRCH BLER Measurement", kLogCodeUtranChannelQuality, kMinimumLength,
-                                   RecordPreamble::OtherCodes::Ignored, kLogNotice};
+constexpr RecordRule kRules[] = {{kLogCodeUtranChannelQuality, kMinimumLength}};
+constexpr DecoderRules kDecoderRules{"TRCH BLER Measurement", kRules, DecoderRules::OtherCodes::Ignored,
+                                     kLogNotice};
 
 constexpr RecordField kEntryFields[] = {
     u8Field(0, "TRCH ID"),
@@ -24,9 +25,10 @@ constexpr RecordField kEntryFields[] = {
 }  // namespace
 
 TRCHBLERMeasurement::TRCHBLERMeasurement() : TableDecoder(rowOf<TRCHBLERMeasurement>(kUtranDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<TRCHBLERMeasurement>(kUtranDecoders)));
 
 void TRCHBLERMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

@@ -2,7 +2,7 @@
 
 #include "LogGenerator/ListSection.h"
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "core/platform/logcodes/UtranLogCodes.h"
 
@@ -10,8 +10,8 @@ namespace velmar {
 
 namespace {
 
-constexpr RecordPreamble kPreamble{"NeighbhorMeasurements List", kLogCodeUtranNeighbourMeasurement, 21,
-                                   RecordPreamble::OtherCodes::Ignored};
+constexpr RecordRule kRules[] = {{kLogCodeUtranNeighbourMeasurement, 21}};
+constexpr DecoderRules kDecoderRules{"NeighbhorMeasurements List", kRules, DecoderRules::OtherCodes::Ignored};
 
 constexpr std::size_t kCountOffset = 16;
 constexpr std::size_t kEntriesOffset = 168;
@@ -46,9 +46,10 @@ PlistValue neighborRow(const RecordReader& record, std::size_t base) {
 
 UTRANNeighbhorMeasurements::UTRANNeighbhorMeasurements()
     : TableDecoder(rowOf<UTRANNeighbhorMeasurements>(kUtranDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<UTRANNeighbhorMeasurements>(kUtranDecoders)));
 
 void UTRANNeighbhorMeasurements::updateWithData(ByteView data, std::int32_t logCode) {
-    if (!acceptRecord(kPreamble, data, logCode)) {
+    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
         return;
     }
     const RecordReader record(data);

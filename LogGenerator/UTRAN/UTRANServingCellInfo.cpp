@@ -2,7 +2,7 @@
 
 #include "LogGenerator/CellInfoArray.h"
 #include "LogGenerator/RecordFields.h"
-#include "LogGenerator/RecordPreamble.h"
+#include "LogGenerator/RecordRule.h"
 #include "LogGenerator/ServingCellWalk.h"
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "core/platform/KxServerProtocol.h"
@@ -11,9 +11,6 @@
 namespace velmar {
 
 namespace {
-
-constexpr const char* kTitle = "Serving Cell Info";
-constexpr std::size_t kServingCellMinimum = 26;
 
 constexpr ValueName kAllowedAccessRows[] = {{0, 0, "All Calls"}, {1, 1, "Emergency Calls Only"}};
 constexpr ValueNames kAllowedAccess{kAllowedAccessRows, "Unknown"};
@@ -38,23 +35,31 @@ constexpr CellMonitorField kCellMonitorFields[] = {
      "Serving Cell Info: Failed to retrieve UARFCN\n"},
 };
 
+constexpr RecordRule kRules[] = {
+    {kLogCodeUtranServingCell, 26, kServingCellFields},
+    {kLogCodeCellMonitor, 0},
+};
+constexpr DecoderRules kDecoderRules{"Serving Cell Info", kRules, DecoderRules::OtherCodes::Ignored};
+
 }  // namespace
 
 UTRANServingCellInfo::UTRANServingCellInfo() : TableDecoder(rowOf<UTRANServingCellInfo>(kUtranDecoders)) {}
+static_assert(rulesMatch(kRules, rowOf<UTRANServingCellInfo>(kUtranDecoders)));
 
 void UTRANServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    logDecoderTitle(kTitle);
+    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
+    if (rule == nullptr) {
+        return;
+    }
     const PlistDictionaryRef section = sectionDictionary();
-    if (logCode == kLogCodeUtranServingCell) {
-        if (data.size() >= kServingCellMinimum && section) {
-            writeFields(kServingCellFields, RecordReader(data), 0, *section);
-        }
-    } else if (logCode == kLogCodeCellMonitor) {
-        const CellInfoArray cellInfo(data);
-        if (!cellInfo.holdsNothing()) {
-            writeServingCellFields(*cellInfo.cells(), kKxCellMonitorRadioAccessTechnologyUTRAN2,
-                                   ServingCellPick::EveryMatch, kCellMonitorFields, section.get());
-        }
+    if (rule->code == kLogCodeUtranServingCell) {
+        writeRuleFields(*rule, data, section.get());
+        return;
+    }
+    const CellInfoArray cellInfo(data);
+    if (!cellInfo.holdsNothing()) {
+        writeServingCellFields(*cellInfo.cells(), kKxCellMonitorRadioAccessTechnologyUTRAN2,
+                               ServingCellPick::EveryMatch, kCellMonitorFields, section.get());
     }
 }
 
