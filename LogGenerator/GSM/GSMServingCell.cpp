@@ -1,6 +1,6 @@
 #include "LogGenerator/GSM/GSMServingCell.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/CellMonitorWalk.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
@@ -37,17 +37,12 @@ constexpr RecordRule kRules[] = {
 };
 constexpr DecoderRules kDecoderRules{"GSMServingCell", kRules};
 
-void showServingCell(ByteView data, PlistDictionary* section) {
-    const PlistDictionaryRef cell =
-        gsm::firstMatchingCell(data, {kKxCellMonitorRadioAccessTechnologyGSM}, kKxCellMonitorCellTypeServing);
-    if (!cell) {
-        return;
-    }
-    gsm::writeCellNumber(*cell, kKxCellMonitorCellId, section, "Cell ID",
-                         "GSMServingCell: Failed to retrieve Cell ID\n");
-    gsm::writeCellNumber(*cell, kKxCellMonitorARFCN, section, "ARFCN",
-                         "GSMServingCell: Failed to retrieve ARFCN\n");
-}
+constexpr CellMonitorField kCellMonitorFields[] = {
+    {kKxCellMonitorCellId, "Cell ID", "GSMServingCell: Failed to retrieve Cell ID\n"},
+    {kKxCellMonitorARFCN, "ARFCN", "GSMServingCell: Failed to retrieve ARFCN\n"},
+};
+constexpr std::string_view kGsm[] = {kKxCellMonitorRadioAccessTechnologyGSM};
+constexpr ServingCellWalk kServingCellWalk{kGsm, kCellMonitorFields};
 
 }  // namespace
 
@@ -61,7 +56,7 @@ void GSMServingCell::updateWithData(ByteView data, std::int32_t logCode) {
     }
     const PlistDictionaryRef section = sectionDictionary();
     if (rule->code == kLogCodeCellMonitor) {
-        showServingCell(data, section.get());
+        showServingCell(data, kServingCellWalk, section.get());
     } else {
         writeRuleFields(*rule, data, section.get());
     }

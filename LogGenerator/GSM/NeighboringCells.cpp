@@ -3,7 +3,7 @@
 #include <iterator>
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 
-#include "LogGenerator/GSM/CellMonitorWalk.h"
+#include "LogGenerator/CellMonitorWalk.h"
 #include "LogGenerator/GSM/CountedList.h"
 #include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
@@ -37,10 +37,10 @@ constexpr RecordField kNeighbourFields[] = {
 };
 constexpr std::size_t kNeighbourArfcnOffset = 0;
 
-constexpr NeighbourCellField kNeighbourCellFields[] = {
-    {kKxCellMonitorARFCN, "ARFCN", asInt(), "NeighboringCells: Failed to retrieve ARFCN\n"},
-    {kKxCellMonitorRSSI, "RSSI", asInt("%d dBm", 2).withSentinel(kCellMonitorNoReading, ""),
-     "NeighboringCells: Failed to retrieve RSSI\n"},
+constexpr CellMonitorField kNeighbourCellFields[] = {
+    {kKxCellMonitorARFCN, "ARFCN", "NeighboringCells: Failed to retrieve ARFCN\n"},
+    {kKxCellMonitorRSSI, "RSSI", "NeighboringCells: Failed to retrieve RSSI\n",
+     asInt("%d dBm", 2).withSentinel(kCellMonitorNoReading, "")},
 };
 
 }  // namespace

@@ -1,6 +1,6 @@
 #include "LogGenerator/GSM/ServingPLMN.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/CellMonitorWalk.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
@@ -64,20 +64,15 @@ void writeRegistration(ByteView data, PlistDictionary* section) {
 }
 
 // The cell-monitor path writes the codes as plain numbers ("1" for MCC 001), unlike the digits of 0x7135.
-void writeServingCell(ByteView data, PlistDictionary* section) {
-    const PlistDictionaryRef cell = gsm::firstMatchingCell(
-        data, {kKxCellMonitorRadioAccessTechnologyUMTS, kKxCellMonitorRadioAccessTechnologyGSM},
-        kKxCellMonitorCellTypeServing);
-    if (!cell) {
-        return;
-    }
-    gsm::writeCellNumber(*cell, kKxCellMonitorMCC, section, "Mobile Country Code",
-                         "ServingPLMN: Failed to retrieve MCC\n");
-    gsm::writeCellNumber(*cell, kKxCellMonitorMNC, section, "Mobile Network Code",
-                         "ServingPLMN: Failed to retrieve MNC\n");
-    gsm::writeCellNumber(*cell, kKxCellMonitorLAC, section, "Location Area Code",
-                         "ServingPLMN: Failed to retrieve LAC\n");
-}
+// The first serving cell of either technology counts.
+constexpr CellMonitorField kCellMonitorFields[] = {
+    {kKxCellMonitorMCC, "Mobile Country Code", "ServingPLMN: Failed to retrieve MCC\n"},
+    {kKxCellMonitorMNC, "Mobile Network Code", "ServingPLMN: Failed to retrieve MNC\n"},
+    {kKxCellMonitorLAC, "Location Area Code", "ServingPLMN: Failed to retrieve LAC\n"},
+};
+constexpr std::string_view kUmtsOrGsm[] = {kKxCellMonitorRadioAccessTechnologyUMTS,
+                                           kKxCellMonitorRadioAccessTechnologyGSM};
+constexpr ServingCellWalk kServingCellWalk{kUmtsOrGsm, kCellMonitorFields};
 
 }  // namespace
 
@@ -95,7 +90,7 @@ void ServingPLMN::updateWithData(ByteView data, std::int32_t logCode) {
             writeRegistration(data, section.get());
             break;
         case kLogCodeCellMonitor:
-            writeServingCell(data, section.get());
+            showServingCell(data, kServingCellWalk, section.get());
             break;
         default:
             writeRuleFields(*rule, data, section.get());

@@ -1,6 +1,6 @@
 #include "LogGenerator/GSM/UMTSRRInfo.h"
 
-#include "LogGenerator/GSM/GsmDecoderSupport.h"
+#include "LogGenerator/CellMonitorWalk.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/RecordRule.h"
 #include "core/platform/KxServerProtocol.h"
@@ -81,19 +81,13 @@ void writeCellIdentity(ByteView data, PlistDictionary* section) {
     writeFields(kUraFields, record, 0, *section);
 }
 
-void writeServingCell(ByteView data, PlistDictionary* section) {
-    const PlistDictionaryRef cell = gsm::firstMatchingCell(data, {kKxCellMonitorRadioAccessTechnologyUMTS},
-                                                           kKxCellMonitorCellTypeServing);
-    if (!cell) {
-        return;
-    }
-    gsm::writeCellNumber(*cell, kKxCellMonitorCellId, section, "Cell ID",
-                         "UMTSRRInfo: Failed to retrieve Cell ID\n");
-    gsm::writeCellNumber(*cell, kKxCellMonitorUARFCN, section, "UARFCN",
-                         "UMTSRRInfo: Failed to retrieve UARFCN\n");
-    gsm::writeCellNumber(*cell, kKxCellMonitorPSC, section, "Scrambling Code",
-                         "UMTSRRInfo: Failed to retrieve Scrambling Code\n");
-}
+constexpr CellMonitorField kCellMonitorFields[] = {
+    {kKxCellMonitorCellId, "Cell ID", "UMTSRRInfo: Failed to retrieve Cell ID\n"},
+    {kKxCellMonitorUARFCN, "UARFCN", "UMTSRRInfo: Failed to retrieve UARFCN\n"},
+    {kKxCellMonitorPSC, "Scrambling Code", "UMTSRRInfo: Failed to retrieve Scrambling Code\n"},
+};
+constexpr std::string_view kUmts[] = {kKxCellMonitorRadioAccessTechnologyUMTS};
+constexpr ServingCellWalk kServingCellWalk{kUmts, kCellMonitorFields};
 
 }  // namespace
 
@@ -114,7 +108,7 @@ void UMTSRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
             writeCellIdentity(data, section.get());
             break;
         case kLogCodeCellMonitor:
-            writeServingCell(data, section.get());
+            showServingCell(data, kServingCellWalk, section.get());
             break;
         default:
             writeRuleFields(*rule, data, section.get());

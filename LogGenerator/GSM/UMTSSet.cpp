@@ -1,6 +1,6 @@
 #include "LogGenerator/GSM/UMTSSet.h"
 
-#include "LogGenerator/GSM/CellMonitorWalk.h"
+#include "LogGenerator/CellMonitorWalk.h"
 #include "LogGenerator/GSM/ORV_GSMClassIndex.h"
 #include "LogGenerator/GSM/RecordRows.h"
 #include "LogGenerator/RecordRule.h"
@@ -29,13 +29,13 @@ constexpr RecordField kUmtsCellFields[] = {
 
 constexpr RecordRowList kUmtsCells{13, 15, 10, kUmtsCellFields};
 
-constexpr NeighbourCellField kNeighbourCellFields[] = {
-    {kKxCellMonitorUARFCN, "UARFCN", asInt(), "UMTSSet: Failed to retrieve UARFCN\n"},
-    {kKxCellMonitorPSC, "Scrambling Code", asInt(), "UMTSSet: Failed to retrieve Scrambling Code\n"},
-    {kKxCellMonitorRSCP, "RSCP", asInt("%d dBm").withSentinel(kCellMonitorNoReading, ""),
-     "UMTSSet: Failed to retrieve RSCP\n"},
-    {kKxCellMonitorEcN0, "Energy Per Chip", asInt("%d dB").withSentinel(kCellMonitorNoReading, ""),
-     "UMTSSet: Failed to retrieve Energy Per Chip\n"},
+constexpr CellMonitorField kNeighbourCellFields[] = {
+    {kKxCellMonitorUARFCN, "UARFCN", "UMTSSet: Failed to retrieve UARFCN\n"},
+    {kKxCellMonitorPSC, "Scrambling Code", "UMTSSet: Failed to retrieve Scrambling Code\n"},
+    {kKxCellMonitorRSCP, "RSCP", "UMTSSet: Failed to retrieve RSCP\n",
+     asInt("%d dBm").withSentinel(kCellMonitorNoReading, "")},
+    {kKxCellMonitorEcN0, "Energy Per Chip", "UMTSSet: Failed to retrieve Energy Per Chip\n",
+     asInt("%d dB").withSentinel(kCellMonitorNoReading, "")},
 };
 
 }  // namespace

@@ -1,10 +1,9 @@
 #include "LogGenerator/LTE/LTEServingCellInfo.h"
 
-#include "LogGenerator/CellInfoArray.h"
+#include "LogGenerator/CellMonitorWalk.h"
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordRule.h"
-#include "LogGenerator/ServingCellWalk.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/logcodes/LteLogCodes.h"
 
@@ -38,14 +37,16 @@ constexpr RecordField kMasterInformation[] = {
 };
 
 constexpr CellMonitorField kCellMonitorFields[] = {
-    {kKxCellMonitorTAC, "Tracking Area Code", nullptr, "Serving Cell Info: Failed to retrieve TAC\n"},
-    {kKxCellMonitorCellId, "Cell Identity", nullptr, "Serving Cell Info: Failed to retrieve Cell ID\n"},
-    {kKxCellMonitorPID, "Physical Cell ID", nullptr,
-     "Serving Cell Info: Failed to retrieve Physical Cell ID\n"},
-    {kKxCellMonitorBandInfo, "Freq Band Indicator", nullptr,
+    {kKxCellMonitorTAC, "Tracking Area Code", "Serving Cell Info: Failed to retrieve TAC\n"},
+    {kKxCellMonitorCellId, "Cell Identity", "Serving Cell Info: Failed to retrieve Cell ID\n"},
+    {kKxCellMonitorPID, "Physical Cell ID", "Serving Cell Info: Failed to retrieve Physical Cell ID\n"},
+    {kKxCellMonitorBandInfo, "Freq Band Indicator",
      "Serving Cell Info: Failed to retrieve Freq Band Indicator\n"},
-    {kKxCellMonitorUARFCN, kUarfcnKey, nullptr, "Serving Cell Info: Failed to retrieve UARFCN\n"},
+    {kKxCellMonitorUARFCN, kUarfcnKey, "Serving Cell Info: Failed to retrieve UARFCN\n"},
 };
+
+constexpr std::string_view kLte[] = {kKxCellMonitorRadioAccessTechnologyLTE};
+constexpr ServingCellWalk kServingCellWalk{kLte, kCellMonitorFields};
 
 constexpr RecordRule kRules[] = {
     {kLogCodeLteServingCellInfo, 38},
@@ -82,16 +83,9 @@ void LTEServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
             reportUnknownLogMessage(logCode);
             return;
         }
-        default: {
-            const CellInfoArray cellInfo(data);
-            if (cellInfo.holdsNothing()) {
-                SystemLog::log(kLogError, "Failed to get Cell Array\n");
-                return;
-            }
-            writeServingCellFields(*cellInfo.cells(), kKxCellMonitorRadioAccessTechnologyLTE,
-                                   ServingCellPick::FirstMatch, kCellMonitorFields, section.get());
+        default:
+            showServingCell(data, kServingCellWalk, section.get());
             return;
-        }
     }
 }
 

@@ -1,9 +1,8 @@
 #include "LogGenerator/UTRAN/UTRANServingCellInfo.h"
 
-#include "LogGenerator/CellInfoArray.h"
+#include "LogGenerator/CellMonitorWalk.h"
 #include "LogGenerator/RecordFields.h"
 #include "LogGenerator/RecordRule.h"
-#include "LogGenerator/ServingCellWalk.h"
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/logcodes/UtranLogCodes.h"
@@ -25,15 +24,20 @@ constexpr RecordField kServingCellFields[] = {
 };
 
 constexpr CellMonitorField kCellMonitorFields[] = {
-    {kKxCellMonitorLAC, "Local Area Code", nullptr, "Serving Cell Info: Failed to retrieve LAC\n"},
-    {kKxCellMonitorCellId, "Cell ID", nullptr, "Serving Cell Info: Failed to retrieve Cell ID\n"},
-    {kKxCellMonitorBandInfo, "Freq Band Indicator", nullptr,
+    {kKxCellMonitorLAC, "Local Area Code", "Serving Cell Info: Failed to retrieve LAC\n"},
+    {kKxCellMonitorCellId, "Cell ID", "Serving Cell Info: Failed to retrieve Cell ID\n"},
+    {kKxCellMonitorBandInfo, "Freq Band Indicator",
      "Serving Cell Info: Failed to retrieve Freq Band Indicator\n"},
-    {kKxCellMonitorSCN, "Cell Scrambling Code", nullptr,
+    {kKxCellMonitorSCN, "Cell Scrambling Code",
      "Serving Cell Info: Failed to retrieve Cell Scrambling Code\n"},
-    {kKxCellMonitorUARFCN, "Uplink UARFCN", "Downlink UARFCN",
-     "Serving Cell Info: Failed to retrieve UARFCN\n"},
+    {kKxCellMonitorUARFCN, "Uplink UARFCN", "Serving Cell Info: Failed to retrieve UARFCN\n", asInt(),
+     "Downlink UARFCN"},
 };
+
+// Every serving UTRAN cell is visited, so the last one's values remain; an unreadable array is not reported.
+constexpr std::string_view kUtran[] = {kKxCellMonitorRadioAccessTechnologyUTRAN2};
+constexpr ServingCellWalk kServingCellWalk{kUtran, kCellMonitorFields, ServingCellWalk::Pick::EveryMatch,
+                                           ServingCellWalk::UnreadableArray::Silent};
 
 constexpr RecordRule kRules[] = {
     {kLogCodeUtranServingCell, 26, kServingCellFields},
@@ -56,11 +60,7 @@ void UTRANServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
         writeRuleFields(*rule, data, section.get());
         return;
     }
-    const CellInfoArray cellInfo(data);
-    if (!cellInfo.holdsNothing()) {
-        writeServingCellFields(*cellInfo.cells(), kKxCellMonitorRadioAccessTechnologyUTRAN2,
-                               ServingCellPick::EveryMatch, kCellMonitorFields, section.get());
-    }
+    showServingCell(data, kServingCellWalk, section.get());
 }
 
 }  // namespace velmar
