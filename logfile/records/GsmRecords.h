@@ -44,8 +44,8 @@ struct GsmMeasurementRecord {
     std::uint32_t c1 = 0;                 // 16..19
     std::uint32_t c2 = 0;                 // 20..23
     std::uint8_t reselectHysteresis = 0;  // 26
-    std::vector<GsmNeighbourMeasurement> neighbours;
-    std::optional<std::uint8_t> countOverride;
+    std::vector<GsmNeighbourMeasurement> neighbours{};
+    std::optional<std::uint8_t> countOverride{};
     std::size_t length = 0;
 };
 PlistData buildGsmMeasurementRecord(const GsmMeasurementRecord& record, std::uint64_t timestamp = 0);
@@ -138,18 +138,18 @@ PlistData buildSimFilesRecord(const SimFilesRecord& record, std::uint64_t timest
 
 // 0xFF0001: one cell of the cell-monitor array. Absent optionals are left out of the dictionary.
 struct CellMonitorEntry {
-    std::optional<std::string> technology;  // kKxCellMonitorCellRadioAccessTechnology
-    std::optional<std::string> cellType;    // kKxCellMonitorCellType
-    std::optional<std::int64_t> cellId;
-    std::optional<std::int64_t> arfcn;
-    std::optional<std::int64_t> rssi;
-    std::optional<std::int64_t> uarfcn;
-    std::optional<std::int64_t> psc;
-    std::optional<std::int64_t> rscp;
-    std::optional<std::int64_t> ecn0;
-    std::optional<std::int64_t> mcc;
-    std::optional<std::int64_t> mnc;
-    std::optional<std::int64_t> lac;
+    std::optional<std::string> technology{};  // kKxCellMonitorCellRadioAccessTechnology
+    std::optional<std::string> cellType{};    // kKxCellMonitorCellType
+    std::optional<std::int64_t> cellId{};
+    std::optional<std::int64_t> arfcn{};
+    std::optional<std::int64_t> rssi{};
+    std::optional<std::int64_t> uarfcn{};
+    std::optional<std::int64_t> psc{};
+    std::optional<std::int64_t> rscp{};
+    std::optional<std::int64_t> ecn0{};
+    std::optional<std::int64_t> mcc{};
+    std::optional<std::int64_t> mnc{};
+    std::optional<std::int64_t> lac{};
 };
 PlistValue cellMonitorEntryDictionary(const CellMonitorEntry& entry);
 PlistData buildCellMonitorEntries(const std::vector<CellMonitorEntry>& entries, std::uint64_t timestamp = 0);

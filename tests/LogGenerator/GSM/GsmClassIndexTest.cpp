@@ -13,7 +13,7 @@
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/records/GsmRecords.h"
 #include "logfile/records/RecordBuilder.h"
-#include "tests/LogGenerator/GSM/GsmTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 // Records and cells are written with designated initializers; the fields left out keep their defaults.
@@ -159,7 +159,7 @@ TEST(GsmClassIndex, PlaceholdersOnlyLogTheirNames) {
 }
 
 TEST(GsmGenerator, CellSetRecordReachesTheFourSetDecodersInOrder) {
-    gsm_testing::GsmGeneratorHarness harness;
+    testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
     harness.feed(RecordBuilder(0x1234).build());  // builds the display tree
     LogCapture capture;
     harness.feed(buildUmtsCellSetRecord({}));
@@ -169,7 +169,7 @@ TEST(GsmGenerator, CellSetRecordReachesTheFourSetDecodersInOrder) {
 }
 
 TEST(GsmGenerator, CellMonitorRecordReachesItsFiveDecodersInOrder) {
-    gsm_testing::GsmGeneratorHarness harness;
+    testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
     harness.feed(RecordBuilder(0x1234).build());
     LogCapture capture;
     harness.feed(buildCellMonitorEntries({}));
@@ -284,7 +284,7 @@ TEST(GsmTemplate, EverySectionOccursOnceWithItsContainerType) {
 }
 
 TEST(GsmTemplate, GeneratorBindsEveryDecoderToItsSection) {
-    gsm_testing::GsmGeneratorHarness harness;
+    testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
     harness.feed(RecordBuilder(0x1234).build());
     const PlistValue display = harness.state->get(state_keys::kDisplay);
     ASSERT_TRUE(display.isDictionary());

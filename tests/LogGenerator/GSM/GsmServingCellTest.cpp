@@ -6,7 +6,7 @@
 #include "core/platform/SystemLog.h"
 #include "logfile/records/GsmRecords.h"
 #include "logfile/records/RecordBuilder.h"
-#include "tests/LogGenerator/GSM/GsmTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 // Records and cells are written with designated initializers; the fields left out keep their defaults.
@@ -15,10 +15,10 @@
 namespace velmar {
 namespace {
 
-using gsm_testing::KeySectionDecoder;
-using gsm_testing::rowOf;
-using gsm_testing::textAt;
+using testing::KeySectionHarness;
 using testing::LogCapture;
+using testing::rowOf;
+using testing::textOf;
 
 const std::string kGsm(kKxCellMonitorRadioAccessTechnologyGSM);
 const std::string kUmts(kKxCellMonitorRadioAccessTechnologyUMTS);
@@ -26,7 +26,7 @@ const std::string kServing(kKxCellMonitorCellTypeServing);
 const std::string kNeighbor(kKxCellMonitorCellTypeNeighbor);
 
 TEST(GSMServingCell, IdentityRecordWritesCellIdArfcnAndBsicInOrder) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     LogCapture capture;
     // ARFCN 0x03FD = 1021, BSIC 0x0035 = 53, cell id 0xBEEF = 48879.
     serving.feed(buildGsmServingIdentityRecord({.arfcn = 0x03FD, .bsic = 0x0035, .cellId = 0xBEEF}), 0x5134);
@@ -35,7 +35,7 @@ TEST(GSMServingCell, IdentityRecordWritesCellIdArfcnAndBsicInOrder) {
 }
 
 TEST(GSMServingCell, IdentityRecordOfTwentyFiveBytesIsIgnored) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     serving.feed(buildGsmServingIdentityRecord({.arfcn = 7, .bsic = 8, .cellId = 9, .length = 25}), 0x5134);
     EXPECT_TRUE(serving.section->empty());
     serving.feed(buildGsmServingIdentityRecord({.arfcn = 7, .bsic = 8, .cellId = 9, .length = 26}), 0x5134);
@@ -43,7 +43,7 @@ TEST(GSMServingCell, IdentityRecordOfTwentyFiveBytesIsIgnored) {
 }
 
 TEST(GSMServingCell, MeasurementsShowTheRawLevelAndTheLow16BitsOfC1AndC2) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     // C1 0x0001FFFE keeps 0xFFFE = 65534; C2 0xABCD0012 keeps 0x0012 = 18; the level byte 95 is shown as is.
     serving.feed(buildGsmMeasurementRecord({.rxLevel = 95, .c1 = 0x0001FFFE, .c2 = 0xABCD0012}), 0x5137);
     EXPECT_EQ(PlistValue(serving.section),
@@ -51,17 +51,17 @@ TEST(GSMServingCell, MeasurementsShowTheRawLevelAndTheLow16BitsOfC1AndC2) {
 }
 
 TEST(GSMServingCell, DedicatedArfcnShowsOnlyItsLowByte) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     serving.feed(buildGsmDedicatedChannelRecord({.arfcn = 0x0201}), 0x5076);
-    EXPECT_EQ(textAt(*serving.section, "MA Dedicated ARFCN"), "1");
+    EXPECT_EQ(textOf(*serving.section, "MA Dedicated ARFCN"), "1");
     serving.feed(buildGsmDedicatedChannelRecord({.arfcn = 0x03FF}), 0x5076);
-    EXPECT_EQ(textAt(*serving.section, "MA Dedicated ARFCN"), "255");
+    EXPECT_EQ(textOf(*serving.section, "MA Dedicated ARFCN"), "255");
     serving.feed(buildGsmDedicatedChannelRecord({.arfcn = 0x0107, .length = 16}), 0x5076);
-    EXPECT_EQ(textAt(*serving.section, "MA Dedicated ARFCN"), "255");
+    EXPECT_EQ(textOf(*serving.section, "MA Dedicated ARFCN"), "255");
 }
 
 TEST(GSMServingCell, UnknownCodeIsLoggedAndIgnored) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     LogCapture capture;
     serving.feed(buildGsmServingIdentityRecord({.arfcn = 1}), 0x5135);
     EXPECT_TRUE(serving.section->empty());
@@ -71,7 +71,7 @@ TEST(GSMServingCell, UnknownCodeIsLoggedAndIgnored) {
 }
 
 TEST(GSMServingCell, CellMonitorTakesTheFirstGsmServingCell) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     LogCapture capture;
     serving.feed(buildCellMonitorEntries({
                      {.technology = kUmts, .cellType = kServing, .cellId = 1, .arfcn = 2},
@@ -87,7 +87,7 @@ TEST(GSMServingCell, CellMonitorTakesTheFirstGsmServingCell) {
 }
 
 TEST(GSMServingCell, CellMonitorWithoutGsmServingCellLeavesTheSectionUntouched) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     serving.section->set("Cell ID", "11");
     LogCapture capture;
     serving.feed(buildCellMonitorEntries({{.technology = kUmts, .cellType = kServing, .cellId = 1},
@@ -99,7 +99,7 @@ TEST(GSMServingCell, CellMonitorWithoutGsmServingCellLeavesTheSectionUntouched) 
 }
 
 TEST(GSMServingCell, MissingOrMistypedCellIdDoesNotStopTheArfcn) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     serving.section->set("Cell ID", "11");
     LogCapture capture;
     auto cell = cellMonitorEntryDictionary({.technology = kGsm, .cellType = kServing, .arfcn = 512});
@@ -120,7 +120,7 @@ TEST(GSMServingCell, MissingOrMistypedCellIdDoesNotStopTheArfcn) {
 }
 
 TEST(GSMServingCell, CellMonitorNumbersMayBeReals) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     auto cell = cellMonitorEntryDictionary({.technology = kGsm, .cellType = kServing});
     cell.dictionary()->set(kKxCellMonitorCellId, PlistValue::real(-17.9));
     cell.dictionary()->set(kKxCellMonitorARFCN, PlistValue::real(60.5));
@@ -131,7 +131,7 @@ TEST(GSMServingCell, CellMonitorNumbersMayBeReals) {
 }
 
 TEST(GSMServingCell, UnparsableCellMonitorRecordIsLogged) {
-    KeySectionDecoder<GSMServingCell> serving;
+    KeySectionHarness<GSMServingCell> serving;
     serving.section->set("ARFCN", "3");
     LogCapture capture;
     const std::uint8_t garbage[] = {'n', 'o', 't', ' ', 'a', ' ', 'p', 'l', 'i', 's', 't'};
@@ -154,7 +154,7 @@ TEST(GSMServingCell, UnboundDecoderStillLogs) {
 }
 
 TEST(MobileAllocation, HsnAndAnArrayOfArfcnStrings) {
-    KeySectionDecoder<MobileAllocation> allocation;
+    KeySectionHarness<MobileAllocation> allocation;
     LogCapture capture;
     allocation.feed(buildMobileAllocationRecord({.hsn = 63, .arfcns = {1, 0x0203, 1023}}), 0x51F8);
     auto arfcns = PlistArray::create();
@@ -170,24 +170,24 @@ TEST(MobileAllocation, HsnAndAnArrayOfArfcnStrings) {
 }
 
 TEST(MobileAllocation, CountZeroStoresAnEmptyArray) {
-    KeySectionDecoder<MobileAllocation> allocation;
+    KeySectionHarness<MobileAllocation> allocation;
     allocation.feed(buildMobileAllocationRecord({.hsn = 2, .arfcns = {5}}), 0x51F8);
     allocation.feed(buildMobileAllocationRecord({.hsn = 0}), 0x51F8);
-    EXPECT_EQ(textAt(*allocation.section, "HSN"), "0");
+    EXPECT_EQ(textOf(*allocation.section, "HSN"), "0");
     ASSERT_TRUE(allocation.section->get("ARFCNs").isArray());
     EXPECT_TRUE(allocation.section->get("ARFCNs").array()->empty());
 }
 
 TEST(MobileAllocation, FourteenBytesChangeNothingAndFifteenDo) {
-    KeySectionDecoder<MobileAllocation> allocation;
+    KeySectionHarness<MobileAllocation> allocation;
     allocation.feed(buildMobileAllocationRecord({.hsn = 9, .length = 14}), 0x51F8);
     EXPECT_TRUE(allocation.section->empty());
     allocation.feed(buildMobileAllocationRecord({.hsn = 9, .length = 15}), 0x51F8);
-    EXPECT_EQ(textAt(*allocation.section, "HSN"), "9");
+    EXPECT_EQ(textOf(*allocation.section, "HSN"), "9");
 }
 
 TEST(MobileAllocation, CountPastTheEndReadsMissingArfcnsAsZero) {
-    KeySectionDecoder<MobileAllocation> allocation;
+    KeySectionHarness<MobileAllocation> allocation;
     // Count 4 but only one ARFCN (and one stray byte, 0x12) in the record.
     allocation.feed(
         buildMobileAllocationRecord({.hsn = 1, .arfcns = {0x1234}, .countOverride = 4, .length = 18}),
@@ -207,7 +207,7 @@ TEST(MobileAllocation, CountPastTheEndReadsMissingArfcnsAsZero) {
 }
 
 TEST(MobileAllocation, UnknownCodeIsLogged) {
-    KeySectionDecoder<MobileAllocation> allocation;
+    KeySectionHarness<MobileAllocation> allocation;
     LogCapture capture;
     allocation.feed(buildMobileAllocationRecord({.hsn = 1}), 0x51F7);
     EXPECT_EQ(capture.texts(),

@@ -3,12 +3,13 @@
 #include "LogGenerator/GSM/GSMServingCell.h"
 #include "LogGenerator/GSM/GSMSet.h"
 #include "LogGenerator/GSM/NeighboringCells.h"
+#include "LogGenerator/GSM/ORV_GSMLogGenerator.h"
 #include "LogGenerator/GSM/UMTSSet.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/GsmRecords.h"
 #include "logfile/records/RecordBuilder.h"
-#include "tests/LogGenerator/GSM/GsmTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 // Records and cells are written with designated initializers; the fields left out keep their defaults.
@@ -17,11 +18,11 @@
 namespace velmar {
 namespace {
 
-using gsm_testing::KeySectionDecoder;
-using gsm_testing::ListSectionDecoder;
-using gsm_testing::rowOf;
-using gsm_testing::rowsOf;
+using testing::KeySectionHarness;
+using testing::ListSectionHarness;
 using testing::LogCapture;
+using testing::rowOf;
+using testing::rowsOf;
 
 const std::string kGsm(kKxCellMonitorRadioAccessTechnologyGSM);
 const std::string kUmts(kKxCellMonitorRadioAccessTechnologyUMTS);
@@ -29,7 +30,7 @@ const std::string kServing(kKxCellMonitorCellTypeServing);
 const std::string kNeighbor(kKxCellMonitorCellTypeNeighbor);
 
 TEST(NeighboringCells, NeighboursTakeTheirBsicFromTheLastBsicList) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     LogCapture capture;
     // ARFCN 100 is listed twice: the later BSIC, 45, wins.
     neighbours.feed(buildGsmBsicListRecord({.entries = {{100, 23}, {200, 7}, {100, 45}}}), 0x51FF);
@@ -49,7 +50,7 @@ TEST(NeighboringCells, NeighboursTakeTheirBsicFromTheLastBsicList) {
 }
 
 TEST(NeighboringCells, BsicListWithCountZeroRemovesEveryBsic) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     neighbours.feed(buildGsmBsicListRecord({.entries = {{100, 23}}}), 0x51FF);
     neighbours.feed(buildGsmBsicListRecord({}), 0x51FF);
     neighbours.feed(buildGsmMeasurementRecord({.neighbours = {{.arfcn = 100, .rxLevel = 1, .c1 = 2}}}),
@@ -58,7 +59,7 @@ TEST(NeighboringCells, BsicListWithCountZeroRemovesEveryBsic) {
 }
 
 TEST(NeighboringCells, ShortBsicListLeavesTheOldOne) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     neighbours.feed(buildGsmBsicListRecord({.entries = {{100, 23}}}), 0x51FF);
     neighbours.feed(buildGsmBsicListRecord({.length = 14}), 0x51FF);
     neighbours.feed(buildGsmMeasurementRecord({.neighbours = {{.arfcn = 100, .rxLevel = 1, .c1 = 2}}}),
@@ -68,7 +69,7 @@ TEST(NeighboringCells, ShortBsicListLeavesTheOldOne) {
 }
 
 TEST(NeighboringCells, BsicCountPastTheEndReadsZeros) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     // Count 3 with one whole entry: the two missing ones read as ARFCN 0 with BSIC 0.
     neighbours.feed(buildGsmBsicListRecord({.entries = {{100, 23}}, .countOverride = 3}), 0x51FF);
     neighbours.feed(buildGsmMeasurementRecord({.neighbours = {{.arfcn = 0, .rxLevel = 1, .c1 = 2}}}), 0x5137);
@@ -76,7 +77,7 @@ TEST(NeighboringCells, BsicCountPastTheEndReadsZeros) {
 }
 
 TEST(NeighboringCells, MeasurementOf29BytesWithCountZeroEmptiesNeighboursAndUpdatesTheServingCell) {
-    gsm_testing::GsmGeneratorHarness harness;
+    testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
     harness.feed(buildGsmMeasurementRecord({.neighbours = {{.arfcn = 1, .rxLevel = 2, .c1 = 3}}}));
     ASSERT_EQ(harness.listSection("Neighboring Cells")->size(), 1u);
     const PlistData record = buildGsmMeasurementRecord({.rxLevel = 61, .c1 = 0x00020010, .c2 = 0x0003FFFF});
@@ -84,13 +85,13 @@ TEST(NeighboringCells, MeasurementOf29BytesWithCountZeroEmptiesNeighboursAndUpda
     harness.feed(record);
     EXPECT_TRUE(harness.listSection("Neighboring Cells")->empty());
     const PlistDictionaryRef serving = harness.keySection("GSM Serving Cell");
-    EXPECT_EQ(gsm_testing::textAt(*serving, "RSSI"), "61 dBm");
-    EXPECT_EQ(gsm_testing::textAt(*serving, "C1 Value"), "16");
-    EXPECT_EQ(gsm_testing::textAt(*serving, "C2 Value"), "65535");
+    EXPECT_EQ(testing::textOf(*serving, "RSSI"), "61 dBm");
+    EXPECT_EQ(testing::textOf(*serving, "C1 Value"), "16");
+    EXPECT_EQ(testing::textOf(*serving, "C2 Value"), "65535");
 }
 
 TEST(NeighboringCells, MeasurementOf28BytesChangesNeitherSection) {
-    gsm_testing::GsmGeneratorHarness harness;
+    testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
     harness.feed(
         buildGsmMeasurementRecord({.rxLevel = 50, .neighbours = {{.arfcn = 1, .rxLevel = 2, .c1 = 3}}}));
     harness.feed(buildGsmMeasurementRecord({.rxLevel = 61, .c1 = 5, .c2 = 6, .length = 28}));
@@ -101,7 +102,7 @@ TEST(NeighboringCells, MeasurementOf28BytesChangesNeitherSection) {
 }
 
 TEST(NeighboringCells, NeighbourCountPastTheEndKeepsItsRowsWithZeros) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     // Count 3 with one neighbour; the record ends 5 bytes into the second element.
     neighbours.feed(buildGsmMeasurementRecord({.neighbours = {{.arfcn = 0x0102, .rxLevel = 3, .c1 = 4}},
                                                .countOverride = 3,
@@ -115,7 +116,7 @@ TEST(NeighboringCells, NeighbourCountPastTheEndKeepsItsRowsWithZeros) {
 }
 
 TEST(NeighboringCells, UnknownCodeIsLogged) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     LogCapture capture;
     neighbours.feed(buildGsmBsicListRecord({}), 0x51FE);
     EXPECT_EQ(capture.lines(),
@@ -124,7 +125,7 @@ TEST(NeighboringCells, UnknownCodeIsLogged) {
 }
 
 TEST(NeighboringCells, CellMonitorNeighboursWithTwiceTheirRssi) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     neighbours.section->append(rowOf({{"ARFCN", "old"}}));
     LogCapture capture;
     neighbours.feed(buildCellMonitorEntries({
@@ -143,7 +144,7 @@ TEST(NeighboringCells, CellMonitorNeighboursWithTwiceTheirRssi) {
 }
 
 TEST(NeighboringCells, CellMonitorFailuresLeaveKeysOutButKeepTheRow) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     auto cells = PlistArray::create();
     cells->append(cellMonitorEntryDictionary({.technology = kGsm, .cellType = kNeighbor, .rssi = -50}));
     PlistValue mistyped = cellMonitorEntryDictionary({.technology = kGsm, .cellType = kNeighbor});
@@ -163,7 +164,7 @@ TEST(NeighboringCells, CellMonitorFailuresLeaveKeysOutButKeepTheRow) {
 }
 
 TEST(NeighboringCells, CellMonitorWithoutGsmNeighbourEmptiesTheList) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     neighbours.section->append(rowOf({{"ARFCN", "old"}}));
     neighbours.feed(buildCellMonitorEntries({{.technology = kUmts, .cellType = kNeighbor, .uarfcn = 3}}),
                     0xFF0001);
@@ -171,7 +172,7 @@ TEST(NeighboringCells, CellMonitorWithoutGsmNeighbourEmptiesTheList) {
 }
 
 TEST(NeighboringCells, UnparsableCellMonitorEmptiesTheListAndLogs) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     neighbours.section->append(rowOf({{"ARFCN", "old"}}));
     LogCapture capture;
     neighbours.feed(RecordBuilder(0x0001, 0, kExtendedLogType).build(), 0xFF0001);
@@ -183,7 +184,7 @@ TEST(NeighboringCells, UnparsableCellMonitorEmptiesTheListAndLogs) {
 }
 
 TEST(NeighboringCells, CellMonitorRootThatIsNotAnArrayHoldsNothing) {
-    ListSectionDecoder<NeighboringCells> neighbours;
+    ListSectionHarness<NeighboringCells> neighbours;
     neighbours.section->append(rowOf({{"ARFCN", "old"}}));
     LogCapture capture;
     neighbours.feed(
@@ -196,7 +197,7 @@ TEST(NeighboringCells, CellMonitorRootThatIsNotAnArrayHoldsNothing) {
 }
 
 TEST(GSMSet, RowsFromTheGsmEntriesOfTheIdleMeasurementRecord) {
-    ListSectionDecoder<GSMSet> gsmSet;
+    ListSectionHarness<GSMSet> gsmSet;
     LogCapture capture;
     gsmSet.feed(buildGsmSetRecord({.cells = {{.arfcn = 512, .bsic = 0x0107, .rssi = -97, .rankingValue = -12},
                                              {.arfcn = 1, .bsic = 0, .rssi = 127, .rankingValue = 32767}}}),
@@ -210,7 +211,7 @@ TEST(GSMSet, RowsFromTheGsmEntriesOfTheIdleMeasurementRecord) {
 }
 
 TEST(GSMSet, ShortRecordIsIgnoredAndCountZeroEmpties) {
-    ListSectionDecoder<GSMSet> gsmSet;
+    ListSectionHarness<GSMSet> gsmSet;
     gsmSet.section->append(rowOf({{"ARFCN", "old"}}));
     gsmSet.feed(buildGsmSetRecord({.length = 14}), 0x4005);
     EXPECT_EQ(gsmSet.section->size(), 1u);
@@ -219,7 +220,7 @@ TEST(GSMSet, ShortRecordIsIgnoredAndCountZeroEmpties) {
 }
 
 TEST(GSMSet, CountPastTheEndKeepsItsRows) {
-    ListSectionDecoder<GSMSet> gsmSet;
+    ListSectionHarness<GSMSet> gsmSet;
     gsmSet.feed(buildGsmSetRecord(
                     {.cells = {{.arfcn = 9, .bsic = 8, .rssi = -7, .rankingValue = 6}}, .countOverride = 2}),
                 0x4005);
@@ -230,7 +231,7 @@ TEST(GSMSet, CountPastTheEndKeepsItsRows) {
 }
 
 TEST(GSMSet, UnknownCodeIsLogged) {
-    ListSectionDecoder<GSMSet> gsmSet;
+    ListSectionHarness<GSMSet> gsmSet;
     LogCapture capture;
     gsmSet.feed(buildGsmSetRecord({}), 0x4006);
     EXPECT_EQ(capture.texts(),
@@ -238,7 +239,7 @@ TEST(GSMSet, UnknownCodeIsLogged) {
 }
 
 TEST(GsmAndUmtsSets, BothViewsReadTheirEntriesFromOffset15) {
-    gsm_testing::GsmGeneratorHarness harness;
+    testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
     // One record, UMTS count 1 at 13, GSM count 1 at 14, and the ten bytes at 15 read by both views.
     const std::uint8_t entry[] = {0x10, 0x27, 0x39, 0x01, 0xC0, 0xF6, 0xFF, 0xF3, 0x05, 0x00};
     harness.feed(RecordBuilder(0x4005).u8(13, 1).u8(14, 1).bytes(15, entry).build());

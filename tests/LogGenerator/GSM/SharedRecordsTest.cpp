@@ -3,13 +3,14 @@
 #include <thread>
 
 #include "LogGenerator/GSM/LogCode_0xFF0000.h"
+#include "LogGenerator/GSM/ORV_GSMLogGenerator.h"
 #include "LogGenerator/GSM/PDPContextList.h"
 #include "LogGenerator/GSM/SimInfo.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/records/GsmRecords.h"
 #include "logfile/records/RecordBuilder.h"
-#include "tests/LogGenerator/GSM/GsmTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 // Records and cells are written with designated initializers; the fields left out keep their defaults.
@@ -18,13 +19,13 @@
 namespace velmar {
 namespace {
 
-using gsm_testing::KeySectionDecoder;
-using gsm_testing::ListSectionDecoder;
-using gsm_testing::rowOf;
+using testing::KeySectionHarness;
+using testing::ListSectionHarness;
 using testing::LogCapture;
+using testing::rowOf;
 
 TEST(SimInfo, OnlyTheIccidChangesOnlyEfIccid) {
-    KeySectionDecoder<SimInfo> sim;
+    KeySectionHarness<SimInfo> sim;
     sim.section->set("EF-MSISDN", "old number");
     sim.section->set("EF-ICCID", "old iccid");
     LogCapture capture;
@@ -35,7 +36,7 @@ TEST(SimInfo, OnlyTheIccidChangesOnlyEfIccid) {
 }
 
 TEST(SimInfo, EveryFileIsCopiedInTableOrderWithItsOwnType) {
-    KeySectionDecoder<SimInfo> sim;
+    KeySectionHarness<SimInfo> sim;
     const PlistValue loci =
         PlistValue::data({0x12, 0x34, 0x56, 0x78, 0x13, 0x00, 0x14, 0x00, 0x01, 0xFF, 0x00});
     auto fplmn = PlistArray::create();
@@ -78,7 +79,7 @@ TEST(SimInfo, EveryFileIsCopiedInTableOrderWithItsOwnType) {
 }
 
 TEST(SimInfo, OtherCodesAreIgnoredWithoutAMessage) {
-    KeySectionDecoder<SimInfo> sim;
+    KeySectionHarness<SimInfo> sim;
     LogCapture capture;
     sim.feed(buildSimFilesRecord({.files = {{"kSimFile_ICCID", "1"}}}), 0xFF0002);
     sim.feed(RecordBuilder(0x0000, 0, kExtendedLogType).build(), 0x5134);
@@ -90,7 +91,7 @@ TEST(SimInfo, OtherCodesAreIgnoredWithoutAMessage) {
 }
 
 TEST(SimInfo, ThirteenByteRecordLogsAndThrowsBeforeAnyKeyChanges) {
-    KeySectionDecoder<SimInfo> sim;
+    KeySectionHarness<SimInfo> sim;
     sim.section->set("EF-ICCID", "kept");
     LogCapture capture;
     const PlistData headerOnly = RecordBuilder(0x0000, 0, kExtendedLogType).build();
@@ -103,7 +104,7 @@ TEST(SimInfo, ThirteenByteRecordLogsAndThrowsBeforeAnyKeyChanges) {
 }
 
 TEST(SimInfo, RecordWhoseRootIsNotADictionaryThrows) {
-    KeySectionDecoder<SimInfo> sim;
+    KeySectionHarness<SimInfo> sim;
     auto files = PlistArray::create();
     files->append("kSimFile_ICCID");
     const auto payload = serializeBinary(files);
@@ -134,7 +135,7 @@ TEST(SimInfoDeathTest, UnparsableSimRecordTerminatesTheProgram) {
         {
             SystemLog::setSink([](int, const std::string&) {});
             SystemLog::setMirrorToStderr(true);
-            gsm_testing::GsmGeneratorHarness harness;
+            testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
             std::thread intake([&] { harness.feed(headerOnly); });
             intake.join();
         },
@@ -143,7 +144,7 @@ TEST(SimInfoDeathTest, UnparsableSimRecordTerminatesTheProgram) {
 }
 
 TEST(PDPContextList, ArrayOfContextsReplacesTheRows) {
-    ListSectionDecoder<PDPContextList> contexts;
+    ListSectionHarness<PDPContextList> contexts;
     contexts.section->append(rowOf({{"APN", "old"}}));
     LogCapture capture;
     contexts.feed(
@@ -165,13 +166,13 @@ TEST(PDPContextList, ArrayOfContextsReplacesTheRows) {
 }
 
 TEST(PDPContextList, DictionaryRootLeavesTheRowsAndEmptyArrayEmptiesThem) {
-    ListSectionDecoder<PDPContextList> contexts;
+    ListSectionHarness<PDPContextList> contexts;
     contexts.section->append(rowOf({{"APN", "old"}}));
     LogCapture capture;
     auto dictionary = PlistDictionary::create();
     dictionary->set("APN", "new");
     contexts.feed(buildExtendedPacket(0x0002, *serializeXml(dictionary)), 0xFF0002);
-    EXPECT_EQ(contexts.rows(), gsm_testing::rowsOf({{{"APN", "old"}}}));
+    EXPECT_EQ(contexts.rows(), testing::rowsOf({{{"APN", "old"}}}));
     // Neither unparsable data nor a header-only record is logged.
     contexts.feed(RecordBuilder(0x0002, 0, kExtendedLogType).build(), 0xFF0002);
     EXPECT_EQ(contexts.section->size(), 1u);
@@ -182,7 +183,7 @@ TEST(PDPContextList, DictionaryRootLeavesTheRowsAndEmptyArrayEmptiesThem) {
 }
 
 TEST(PDPContextList, TheCodeIsNotExamined) {
-    ListSectionDecoder<PDPContextList> contexts;
+    ListSectionHarness<PDPContextList> contexts;
     contexts.feed(
         buildPdpContextsRecord({{.contextId = 3, .apn = "a", .pdpType = "IP", .address = "1.2.3.4"}}),
         0x1234);
@@ -192,13 +193,13 @@ TEST(PDPContextList, TheCodeIsNotExamined) {
 }
 
 TEST(PDPContextList, ThroughTheGeneratorTheDisplayShowsTheContexts) {
-    gsm_testing::GsmGeneratorHarness harness;
+    testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
     harness.feed(
         buildPdpContextsRecord({{.contextId = 2, .apn = "web", .pdpType = "IP", .address = "100.64.0.9"}}));
     const PlistArrayRef rows = harness.listSection("PDP Context Info");
     ASSERT_NE(rows, nullptr);
     ASSERT_EQ(rows->size(), 1u);
-    EXPECT_EQ(gsm_testing::textAt(*rows->at(0).dictionary(), "APN"), "web");
+    EXPECT_EQ(testing::textOf(*rows->at(0).dictionary(), "APN"), "web");
 }
 
 }  // namespace

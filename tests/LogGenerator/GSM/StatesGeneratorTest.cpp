@@ -6,7 +6,7 @@
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/GsmStateRecords.h"
-#include "tests/LogGenerator/GSM/StatesTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -86,12 +86,12 @@ TEST_F(StatesGenerator, RegistrationStateIsDispatchedToFourDecodersInOrder) {
     const PlistDictionaryRef cs = sectionOf(state, "Mobility", "Process CS");
     const PlistDictionaryRef plmn = sectionOf(state, "Network", "Serving PLMN");
     ASSERT_TRUE(ps && co && cs && plmn);
-    EXPECT_EQ(testing::textAt(*ps, "MM State"), "GMM_REGISTERED");
-    EXPECT_EQ(testing::textAt(*ps, "MM Service State"), "REG_STATE_OFFLINE");
-    EXPECT_EQ(testing::textAt(*co, "MM Service State"), "REG_STATE_OFFLINE");
-    EXPECT_EQ(testing::textAt(*cs, "MM Service State"), "REG_STATE_OFFLINE");
+    EXPECT_EQ(testing::textOf(*ps, "MM State"), "GMM_REGISTERED");
+    EXPECT_EQ(testing::textOf(*ps, "MM Service State"), "REG_STATE_OFFLINE");
+    EXPECT_EQ(testing::textOf(*co, "MM Service State"), "REG_STATE_OFFLINE");
+    EXPECT_EQ(testing::textOf(*cs, "MM Service State"), "REG_STATE_OFFLINE");
     EXPECT_EQ(testing::keysOf(*plmn), (Strings{"PLMN Sel Mod"}));
-    EXPECT_EQ(testing::textAt(*plmn, "PLMN Sel Mod"), "Manual");
+    EXPECT_EQ(testing::textOf(*plmn, "PLMN Sel Mod"), "Manual");
 }
 
 TEST_F(StatesGenerator, SharedRecordsFillEverySubscribedSection) {
@@ -105,14 +105,14 @@ TEST_F(StatesGenerator, SharedRecordsFillEverySubscribedSection) {
     const PlistDictionaryRef rr = sectionOf(state, "GSM", "GSM RR Info");
     const PlistDictionaryRef plmn = sectionOf(state, "Network", "Serving PLMN");
     ASSERT_TRUE(gprs && rr && plmn);
-    EXPECT_EQ(testing::textAt(*gprs, "Network Operating Mode"), "Class 2");
-    EXPECT_EQ(testing::textAt(*gprs, "T3192"), "120 ms");
-    EXPECT_EQ(testing::textAt(*gprs, "DRX Timer Max"), "6");
-    EXPECT_EQ(testing::textAt(*rr, "DRX Used"), "6 sec");
-    EXPECT_EQ(testing::textAt(*plmn, "Mobile Country Code"), "262");
-    EXPECT_EQ(testing::textAt(*plmn, "Mobile Network Code"), "01 ");
-    EXPECT_EQ(testing::textAt(*plmn, "Location Area Code"), "43981");  // 0xABCD
-    EXPECT_EQ(testing::textAt(*plmn, "Service Type"), "PS_ONLY");
+    EXPECT_EQ(testing::textOf(*gprs, "Network Operating Mode"), "Class 2");
+    EXPECT_EQ(testing::textOf(*gprs, "T3192"), "120 ms");
+    EXPECT_EQ(testing::textOf(*gprs, "DRX Timer Max"), "6");
+    EXPECT_EQ(testing::textOf(*rr, "DRX Used"), "6 sec");
+    EXPECT_EQ(testing::textOf(*plmn, "Mobile Country Code"), "262");
+    EXPECT_EQ(testing::textOf(*plmn, "Mobile Network Code"), "01 ");
+    EXPECT_EQ(testing::textOf(*plmn, "Location Area Code"), "43981");  // 0xABCD
+    EXPECT_EQ(testing::textOf(*plmn, "Service Type"), "PS_ONLY");
 }
 
 }  // namespace

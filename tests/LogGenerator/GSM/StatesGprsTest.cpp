@@ -5,8 +5,10 @@
 #include "LogGenerator/GSM/CodingScheme.h"
 #include "LogGenerator/GSM/GPRSInformation.h"
 #include "core/platform/SystemLog.h"
+#include "logfile/records/GsmRecords.h"
 #include "logfile/records/GsmStateRecords.h"
-#include "tests/LogGenerator/GSM/StatesTestSupport.h"
+#include "logfile/records/RecordBuilder.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -123,10 +125,10 @@ TEST(StatesGprs, PbcchAndPacketSystemInformation) {
 
 TEST(StatesGprs, CellReselectHysteresisFromTheMeasurementRecord) {
     KeySectionHarness<GPRSInformation> gprs;
-    gprs.feed(testing::servingMeasurement(40, 0, 0, 0));
+    gprs.feed(buildGsmMeasurementRecord({.rxLevel = 40, .c1 = 0, .c2 = 0, .reselectHysteresis = 0}));
     EXPECT_EQ(gprs.keys(), (Strings{"Cell Reselect Hysteresis"}));
     EXPECT_EQ(gprs.text("Cell Reselect Hysteresis"), "Not Applied");
-    gprs.feed(testing::servingMeasurement(0, 0, 0, 4));
+    gprs.feed(buildGsmMeasurementRecord({.rxLevel = 0, .c1 = 0, .c2 = 0, .reselectHysteresis = 4}));
     EXPECT_EQ(gprs.text("Cell Reselect Hysteresis"), "Applied");
 }
 
@@ -139,7 +141,7 @@ TEST(StatesGprs, MinimumLengths) {
         {buildPbcchRecord({.pbcchPresent = 1}), 34},
         {buildPacketSystemInfoRecord({.packetSiStatus = 1}), 35},
         {buildSi13PositionRecord({.si13Position = 1}), 15},
-        {testing::servingMeasurement(0, 0, 0, 1), 29},
+        {buildGsmMeasurementRecord({.rxLevel = 0, .c1 = 0, .c2 = 0, .reselectHysteresis = 1}), 29},
     };
     LogCapture capture;
     for (const auto& [record, minimum] : records) {

@@ -5,7 +5,8 @@
 #include "LogGenerator/GSM/HSDPAInformation.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/GsmStateRecords.h"
-#include "tests/LogGenerator/GSM/StatesTestSupport.h"
+#include "logfile/records/RecordBuilder.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -14,7 +15,7 @@ namespace {
 using testing::cut;
 using testing::KeySectionHarness;
 using testing::LogCapture;
-using testing::rowsOf;
+using testing::rowTexts;
 using Strings = std::vector<std::string>;
 using Lines = std::vector<LogCapture::Line>;
 
@@ -59,9 +60,9 @@ TEST(StatesHsdpa, SecondaryListIsReadAt18Plus162TimesP) {
     hsdpa.feed(builder.build());
     EXPECT_EQ(hsdpa.keys(), (Strings{"Version", "Sub Frames", "Carrier Info", "Primary HARQ Process",
                                      "Secondary HARQ Process"}));
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Primary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Primary HARQ Process")),
               (Strings{"Process ID=4, No Rx Bits=4294967295, New Tx=65535, Block Errors=3"}));
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Secondary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Secondary HARQ Process")),
               (Strings{"Process ID=6, No Rx Bits=123456, New Tx=700, Block Errors=12"}));
 }
 
@@ -75,10 +76,10 @@ TEST(StatesHsdpa, BuiltRecordWithSeveralEntries) {
     EXPECT_EQ(hsdpa.text("Version"), "2");
     EXPECT_EQ(hsdpa.text("Sub Frames"), "1000");
     EXPECT_EQ(hsdpa.text("Carrier Info"), "Reserved");
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Primary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Primary HARQ Process")),
               (Strings{"Process ID=0, No Rx Bits=1000, New Tx=10, Block Errors=1",
                        "Process ID=1, No Rx Bits=2000, New Tx=20, Block Errors=2"}));
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Secondary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Secondary HARQ Process")),
               (Strings{"Process ID=7, No Rx Bits=70000, New Tx=7, Block Errors=0"}));
     // 18 + 162·2 = 342 is where the secondary entry lies; the record ends after it.
     EXPECT_EQ(buildHsdpaRecord({.primary = {{}, {}}, .secondary = {{}}}).size(), 342u + 9u);
@@ -91,15 +92,15 @@ TEST(StatesHsdpa, EmptyListsKeepTheirEarlierRows) {
     EXPECT_EQ(hsdpa.text("Version"), "9");
     EXPECT_EQ(hsdpa.text("Sub Frames"), "5");
     EXPECT_EQ(hsdpa.text("Carrier Info"), "MIMO");
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Primary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Primary HARQ Process")),
               (Strings{"Process ID=1, No Rx Bits=1, New Tx=1, Block Errors=1"}));
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Secondary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Secondary HARQ Process")),
               (Strings{"Process ID=2, No Rx Bits=2, New Tx=2, Block Errors=2"}));
     // Primary only: the secondary list stays.
     hsdpa.feed(buildHsdpaRecord({.primary = {{3, 3, 3, 3}}}));
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Primary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Primary HARQ Process")),
               (Strings{"Process ID=3, No Rx Bits=3, New Tx=3, Block Errors=3"}));
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Secondary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Secondary HARQ Process")),
               (Strings{"Process ID=2, No Rx Bits=2, New Tx=2, Block Errors=2"}));
 }
 
@@ -108,11 +109,11 @@ TEST(StatesHsdpa, CountsPastTheEndReadZeros) {
     // P = 3 with one entry present; S = 2 at 18 + 486 = 504, far past the end.
     hsdpa.feed(buildHsdpaRecord(
         {.primary = {{5, 50, 5, 5}}, .primaryCountOverride = 3, .secondaryCountOverride = 2}));
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Primary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Primary HARQ Process")),
               (Strings{"Process ID=5, No Rx Bits=50, New Tx=5, Block Errors=5",
                        "Process ID=0, No Rx Bits=0, New Tx=0, Block Errors=0",
                        "Process ID=0, No Rx Bits=0, New Tx=0, Block Errors=0"}));
-    EXPECT_EQ(rowsOf(*hsdpa.section->find("Secondary HARQ Process")),
+    EXPECT_EQ(rowTexts(*hsdpa.section->find("Secondary HARQ Process")),
               (Strings{"Process ID=0, No Rx Bits=0, New Tx=0, Block Errors=0",
                        "Process ID=0, No Rx Bits=0, New Tx=0, Block Errors=0"}));
     // 255 × 162 past the start: still nothing read outside the buffer.
@@ -149,7 +150,7 @@ TEST(StatesBler, ChannelsAreSignedDecimal) {
         {.windowSize = 65535, .channels = {{3, 0xFFFFFFFF, 17}, {31, 1000, 0x80000000}}}));
     EXPECT_EQ(bler.keys(), (Strings{"Window Size", "Transport Channels"}));
     EXPECT_EQ(bler.text("Window Size"), "65535");
-    EXPECT_EQ(rowsOf(*bler.section->find("Transport Channels")),
+    EXPECT_EQ(rowTexts(*bler.section->find("Transport Channels")),
               (Strings{"Transport Channel ID=3, CRC Received=-1, CRC Received in Error=17",
                        "Transport Channel ID=31, CRC Received=1000, CRC Received in Error=-2147483648"}));
 }
@@ -168,7 +169,7 @@ TEST(StatesBler, ZeroChannelsStoreAnEmptyArray) {
 TEST(StatesBler, CountPastTheEnd) {
     KeySectionHarness<BLER> bler;
     bler.feed(buildBlockErrorRecord({.windowSize = 4, .channels = {{9, 90, 9}}, .countOverride = 3}));
-    EXPECT_EQ(rowsOf(*bler.section->find("Transport Channels")),
+    EXPECT_EQ(rowTexts(*bler.section->find("Transport Channels")),
               (Strings{"Transport Channel ID=9, CRC Received=90, CRC Received in Error=9",
                        "Transport Channel ID=0, CRC Received=0, CRC Received in Error=0",
                        "Transport Channel ID=0, CRC Received=0, CRC Received in Error=0"}));

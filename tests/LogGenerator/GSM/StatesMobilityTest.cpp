@@ -6,7 +6,7 @@
 #include "LogGenerator/GSM/ProcessPS.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/GsmStateRecords.h"
-#include "tests/LogGenerator/GSM/StatesTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -197,7 +197,7 @@ TEST(StatesMobility, RegistrationStateInAllThreeSections) {
     cs.feed(offline);
     for (const PlistDictionaryRef& section : {ps.section, co.section, cs.section}) {
         EXPECT_EQ(keysOf(*section), (Strings{"MM Service State"}));
-        EXPECT_EQ(testing::textAt(*section, "MM Service State"), "REG_STATE_OFFLINE");
+        EXPECT_EQ(testing::textOf(*section, "MM Service State"), "REG_STATE_OFFLINE");
     }
     const Strings names = {"REG_STATE_INACTIVE",      "REG_STATE_IDLE",
                            "REG_STATE_REGISTERING",   "REG_STATE_DEREGISTERING",

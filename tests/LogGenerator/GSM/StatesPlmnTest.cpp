@@ -6,8 +6,10 @@
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
+#include "logfile/records/GsmRecords.h"
 #include "logfile/records/GsmStateRecords.h"
-#include "tests/LogGenerator/GSM/StatesTestSupport.h"
+#include "logfile/records/RecordBuilder.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -136,7 +138,7 @@ TEST(StatesPlmn, MinimumLengths) {
     EXPECT_EQ(*equivalent.section->at(0).string(), "old row");
     // Exactly 17 bytes: the count is read and its entry lies wholly past the end, so it reads as zeros.
     equivalent.feed(cut(buildEquivalentPlmnRecord({.count = 1, .listBytes = {3, 2, 1, 6, 0, 0}}), 17));
-    EXPECT_EQ(equivalent.rows(), (Strings{"Mobile Country Code=0, Mobile Network Code=0"}));
+    EXPECT_EQ(equivalent.rowTexts(), (Strings{"Mobile Country Code=0, Mobile Network Code=0"}));
 }
 
 TEST(StatesPlmn, UnknownCodes) {
@@ -160,7 +162,7 @@ TEST(StatesPlmn, EquivalentListDigitsAlternate) {
     ListSectionHarness<EquivalentPLMNList> equivalent;
     // MCC = 100·b0 + 10·b2 + b4 = 300 + 10 + 0 = 310; MNC = 100·b1 + 10·b3 + b5 = 200 + 60 + 0 = 260.
     equivalent.feed(buildEquivalentPlmnRecord({.count = 1, .listBytes = {3, 2, 1, 6, 0, 0}}));
-    EXPECT_EQ(equivalent.rows(), (Strings{"Mobile Country Code=310, Mobile Network Code=260"}));
+    EXPECT_EQ(equivalent.rowTexts(), (Strings{"Mobile Country Code=310, Mobile Network Code=260"}));
 }
 
 TEST(StatesPlmn, EquivalentEntriesOverlapWithTheirThreeByteStride) {
@@ -169,9 +171,9 @@ TEST(StatesPlmn, EquivalentEntriesOverlapWithTheirThreeByteStride) {
     // Entry 1 reads 20..25 = 1,5,6,7,8,9: MCC 100+60+8 = 168, MNC 500+70+9 = 579.
     // Entry 2 reads 23..28 = 7,8,9,0,0,0 (26.. past the end read zero): MCC 790, MNC 800.
     equivalent.feed(buildEquivalentPlmnRecord({.count = 3, .listBytes = {2, 3, 4, 1, 5, 6, 7, 8, 9}}));
-    EXPECT_EQ(equivalent.rows(), (Strings{"Mobile Country Code=245, Mobile Network Code=316",
-                                          "Mobile Country Code=168, Mobile Network Code=579",
-                                          "Mobile Country Code=790, Mobile Network Code=800"}));
+    EXPECT_EQ(equivalent.rowTexts(), (Strings{"Mobile Country Code=245, Mobile Network Code=316",
+                                              "Mobile Country Code=168, Mobile Network Code=579",
+                                              "Mobile Country Code=790, Mobile Network Code=800"}));
 }
 
 TEST(StatesPlmn, EquivalentCountPastTheEndKeepsItsRows) {
@@ -179,7 +181,7 @@ TEST(StatesPlmn, EquivalentCountPastTheEndKeepsItsRows) {
     // 255 entries announced, 2 bytes present: entry 0 = 9,9,0,0,0,0 → MCC 900, MNC 900; the rest read zero.
     equivalent.feed(buildEquivalentPlmnRecord({.count = 255, .listBytes = {9, 9}}));
     ASSERT_EQ(equivalent.section->size(), 255u);
-    const Strings rows = equivalent.rows();
+    const Strings rows = equivalent.rowTexts();
     EXPECT_EQ(rows.front(), "Mobile Country Code=900, Mobile Network Code=900");
     EXPECT_EQ(rows[1], "Mobile Country Code=0, Mobile Network Code=0");
     EXPECT_EQ(rows.back(), "Mobile Country Code=0, Mobile Network Code=0");
@@ -197,7 +199,7 @@ TEST(StatesPlmn, EquivalentRowsReplaceTheOldOnes) {
     ListSectionHarness<EquivalentPLMNList> equivalent;
     equivalent.feed(buildEquivalentPlmnRecord({.count = 2, .listBytes = {1, 1, 1, 1, 1, 1, 1, 1}}));
     equivalent.feed(buildEquivalentPlmnRecord({.count = 1, .listBytes = {4, 0, 4, 1, 0, 5}}));
-    EXPECT_EQ(equivalent.rows(), (Strings{"Mobile Country Code=440, Mobile Network Code=15"}));
+    EXPECT_EQ(equivalent.rowTexts(), (Strings{"Mobile Country Code=440, Mobile Network Code=15"}));
 }
 
 // ---- cell-monitor path ----
@@ -207,7 +209,7 @@ TEST(StatesPlmn, CellMonitorServingUmtsCellWritesPlainNumbers) {
     serving.feed(buildRegistrationStateRecord({.plmnSelectionMode = 2}));
     serving.feed(buildRegistrationInfoRecord({.serviceType = 1, .routingAreaCode = 7}));
     LogCapture capture;
-    serving.feed(testing::cellMonitorRecord({
+    serving.feed(buildCellMonitorEntries({
         {.technology = kLte, .cellType = kServing, .mcc = 999, .mnc = 99, .lac = 9},
         {.technology = kGsm, .cellType = kNeighbor, .mcc = 888, .mnc = 88, .lac = 8},
         {.technology = kUmts, .cellType = kServing, .mcc = 1, .mnc = 1, .lac = 4660},
@@ -225,7 +227,7 @@ TEST(StatesPlmn, CellMonitorServingUmtsCellWritesPlainNumbers) {
 
 TEST(StatesPlmn, CellMonitorGsmServingCellCountsToo) {
     KeySectionHarness<ServingPLMN> serving;
-    serving.feed(testing::cellMonitorRecord({
+    serving.feed(buildCellMonitorEntries({
         {.technology = kGsm, .cellType = kServing, .mcc = 310, .mnc = 410, .lac = -2},
         {.technology = kUmts, .cellType = kServing, .mcc = 1, .mnc = 1, .lac = 1},
     }));
@@ -240,7 +242,7 @@ TEST(StatesPlmn, CellMonitorMissingKeysLogAndContinue) {
     serving.feed(buildRegistrationInfoRecord({.plmnIdentity = plmnIdentityBytes("310", "410")}));
     LogCapture capture;
     // Entries lacking the technology or the type are skipped; the serving UMTS cell lacks MCC and LAC.
-    serving.feed(testing::cellMonitorRecord({
+    serving.feed(buildCellMonitorEntries({
         {.cellType = kServing, .mcc = 5, .mnc = 5, .lac = 5},
         {.technology = kUmts, .mcc = 6, .mnc = 6, .lac = 6},
         {.technology = kUmts, .cellType = kServing, .mnc = 26},
@@ -266,8 +268,7 @@ TEST(StatesPlmn, CellMonitorMissingNetworkCodeLogsAndKeepsTheOldOne) {
                      .build());
     ASSERT_EQ(serving.text("Mobile Network Code"), "41 ");
     LogCapture capture;
-    serving.feed(
-        testing::cellMonitorRecord({{.technology = kGsm, .cellType = kServing, .mcc = 234, .lac = 9}}));
+    serving.feed(buildCellMonitorEntries({{.technology = kGsm, .cellType = kServing, .mcc = 234, .lac = 9}}));
     EXPECT_EQ(capture.lines(),
               (Lines{{kLogWarning, "Serving PLMN"}, {kLogError, "ServingPLMN: Failed to retrieve MNC\n"}}));
     EXPECT_EQ(serving.text("Mobile Country Code"), "234");
@@ -320,9 +321,9 @@ TEST(StatesPlmn, CellMonitorUnparsableEmptyOrWithoutMatch) {
     EXPECT_EQ(capture.lines(), expected);
     capture.clear();
     // An empty array and an array without a serving GSM/UMTS cell change nothing, silently.
-    serving.feed(testing::cellMonitorRecord({}), 0xFF0001);
-    serving.feed(testing::cellMonitorRecord({{.technology = kLte, .cellType = kServing, .mcc = 1},
-                                             {.technology = kUmts, .cellType = kNeighbor, .mcc = 2}}),
+    serving.feed(buildCellMonitorEntries({}), 0xFF0001);
+    serving.feed(buildCellMonitorEntries({{.technology = kLte, .cellType = kServing, .mcc = 1},
+                                          {.technology = kUmts, .cellType = kNeighbor, .mcc = 2}}),
                  0xFF0001);
     EXPECT_EQ(capture.lines(), (Lines{{kLogWarning, "Serving PLMN"}, {kLogWarning, "Serving PLMN"}}));
     EXPECT_TRUE(serving.section->empty());
@@ -333,8 +334,8 @@ TEST(StatesPlmn, CellMonitorNumberFormsDifferFromTheBcdForm) {
     serving.feed(buildRegistrationInfoRecord({.plmnIdentity = plmnIdentityBytes("001", "01")}));
     EXPECT_EQ(serving.text("Mobile Country Code"), "001");
     EXPECT_EQ(serving.text("Mobile Network Code"), "01 ");
-    serving.feed(testing::cellMonitorRecord(
-        {{.technology = kGsm, .cellType = kServing, .mcc = 1, .mnc = 1, .lac = 1}}));
+    serving.feed(
+        buildCellMonitorEntries({{.technology = kGsm, .cellType = kServing, .mcc = 1, .mnc = 1, .lac = 1}}));
     EXPECT_EQ(serving.text("Mobile Country Code"), "1");
     EXPECT_EQ(serving.text("Mobile Network Code"), "1");
 }

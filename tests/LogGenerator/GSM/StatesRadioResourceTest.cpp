@@ -8,8 +8,10 @@
 #include "LogGenerator/GSM/UMTSRRMeasurement.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/SystemLog.h"
+#include "logfile/records/GsmRecords.h"
 #include "logfile/records/GsmStateRecords.h"
-#include "tests/LogGenerator/GSM/StatesTestSupport.h"
+#include "logfile/records/RecordBuilder.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -90,7 +92,8 @@ TEST(StatesRadioResource, GsmRrStateTableWithItsBlanks) {
 TEST(StatesRadioResource, GsmServingMeasurementsShowWhole32BitValues) {
     KeySectionHarness<GSMRRInfo> gsm;
     // 0x00012345 = 74565 (its low 16 bits alone would be 9029); 0xFFFFFFFE through "%d" is -2.
-    gsm.feed(testing::servingMeasurement(201, 0x00012345, 0xFFFFFFFE, 0));
+    gsm.feed(buildGsmMeasurementRecord(
+        {.rxLevel = 201, .c1 = 0x00012345, .c2 = 0xFFFFFFFE, .reselectHysteresis = 0}));
     EXPECT_EQ(gsm.keys(), (Strings{"Serving Rx Level", "Rx Quality Full", "Rx Quality Sub"}));
     EXPECT_EQ(gsm.text("Serving Rx Level"), "201");
     EXPECT_EQ(gsm.text("Rx Quality Full"), "74565");
@@ -112,13 +115,13 @@ TEST(StatesRadioResource, GsmMinimumLengths) {
     KeySectionHarness<GSMRRInfo> gsm;
     LogCapture capture;
     gsm.feed(cut(buildGsmRrStateRecord({.state = 5}), 16));
-    gsm.feed(cut(testing::servingMeasurement(5, 0, 0, 0), 28));
+    gsm.feed(cut(buildGsmMeasurementRecord({.rxLevel = 5, .c1 = 0, .c2 = 0, .reselectHysteresis = 0}), 28));
     gsm.feed(cut(buildGsmChannelParametersRecord({.dtxUsed = 1}), 19));
     gsm.feed(cut(buildGprsTbfParametersRecord({.drxTimerMax = 4}), 23));
     EXPECT_TRUE(gsm.section->empty());
     EXPECT_TRUE(capture.textsAt(kLogError).empty());
     gsm.feed(cut(buildGsmRrStateRecord({.state = 5}), 17));
-    gsm.feed(cut(testing::servingMeasurement(5, 0, 0, 0), 29));
+    gsm.feed(cut(buildGsmMeasurementRecord({.rxLevel = 5, .c1 = 0, .c2 = 0, .reselectHysteresis = 0}), 29));
     gsm.feed(cut(buildGsmChannelParametersRecord({.dtxUsed = 1}), 20));
     gsm.feed(cut(buildGprsTbfParametersRecord({.drxTimerMax = 4}), 24));
     EXPECT_EQ(gsm.text("RR State"), "RR_IDLE");
@@ -216,7 +219,7 @@ TEST(StatesRadioResource, UmtsCellIdentityRecord) {
 
 TEST(StatesRadioResource, UmtsCellIdentityRemovesTheUarfcnOfCellInformation) {
     KeySectionHarness<UMTSRRInfo> umts;
-    const PlistData cellInfo = testing::cellMonitorRecord(
+    const PlistData cellInfo = buildCellMonitorEntries(
         {{.technology = kUmts, .cellType = kServing, .cellId = 77, .uarfcn = 10700, .psc = 300}});
     umts.feed(cellInfo, 0xFF0001);
     EXPECT_EQ(umts.keys(), (Strings{"Cell ID", "UARFCN", "Scrambling Code"}));
@@ -279,7 +282,7 @@ TEST(StatesRadioResource, UmtsUnknownCodes) {
 TEST(StatesRadioResource, UmtsCellMonitorTakesTheFirstServingUmtsCell) {
     KeySectionHarness<UMTSRRInfo> umts;
     LogCapture capture;
-    umts.feed(testing::cellMonitorRecord({
+    umts.feed(buildCellMonitorEntries({
                   {.technology = kGsm, .cellType = kServing, .cellId = 1, .uarfcn = 1, .psc = 1},
                   {.technology = kUmts, .cellType = kNeighbor, .cellId = 2, .uarfcn = 2, .psc = 2},
                   {.technology = kUmts, .cellType = kServing, .cellId = 123456, .uarfcn = 10836, .psc = 511},
@@ -309,7 +312,7 @@ TEST(StatesRadioResource, UmtsCellMonitorFailuresDoNotStopTheOtherKeys) {
     EXPECT_EQ(umts.keys(), (Strings{"Scrambling Code"}));
     EXPECT_EQ(umts.text("Scrambling Code"), "-7");
     capture.clear();
-    umts.feed(testing::cellMonitorRecord({{.technology = kUmts, .cellType = kServing}}), 0xFF0001);
+    umts.feed(buildCellMonitorEntries({{.technology = kUmts, .cellType = kServing}}), 0xFF0001);
     EXPECT_EQ(capture.lines(), (Lines{{kLogWarning, "UMTSRRInfo"},
                                       {kLogError, "UMTSRRInfo: Failed to retrieve Cell ID\n"},
                                       {kLogError, "UMTSRRInfo: Failed to retrieve UARFCN\n"},
@@ -322,9 +325,8 @@ TEST(StatesRadioResource, UmtsCellMonitorUnparsableOrEmpty) {
     LogCapture capture;
     const std::uint8_t garbage[] = {0x00, 0x01, 0x02};
     umts.feed(buildExtendedPacket(0x0001, garbage), 0xFF0001);
-    umts.feed(testing::cellMonitorRecord({}), 0xFF0001);
-    umts.feed(testing::cellMonitorRecord({{.technology = kGsm, .cellType = kServing, .cellId = 1}}),
-              0xFF0001);
+    umts.feed(buildCellMonitorEntries({}), 0xFF0001);
+    umts.feed(buildCellMonitorEntries({{.technology = kGsm, .cellType = kServing, .cellId = 1}}), 0xFF0001);
     EXPECT_EQ(capture.lines(), (Lines{{kLogWarning, "UMTSRRInfo"},
                                       {kLogError, "Cell Info Array data could not be constructed"},
                                       {kLogError, "Failed to get Cell Array\n"},

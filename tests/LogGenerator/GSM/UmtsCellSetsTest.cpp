@@ -6,13 +6,14 @@
 #include "LogGenerator/GSM/CountedList.h"
 #include "LogGenerator/GSM/DetectedSet.h"
 #include "LogGenerator/GSM/MonitoredSet.h"
+#include "LogGenerator/GSM/ORV_GSMLogGenerator.h"
 #include "LogGenerator/GSM/UMTSSet.h"
 #include "LogGenerator/GSM/VirtualActiveSet.h"
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/GsmRecords.h"
 #include "logfile/records/RecordBuilder.h"
-#include "tests/LogGenerator/GSM/GsmTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 // Records and cells are written with designated initializers; the fields left out keep their defaults.
@@ -21,10 +22,10 @@
 namespace velmar {
 namespace {
 
-using gsm_testing::ListSectionDecoder;
-using gsm_testing::rowOf;
-using gsm_testing::rowsOf;
+using testing::ListSectionHarness;
 using testing::LogCapture;
+using testing::rowOf;
+using testing::rowsOf;
 
 const std::string kGsm(kKxCellMonitorRadioAccessTechnologyGSM);
 const std::string kUmts(kKxCellMonitorRadioAccessTechnologyUMTS);
@@ -32,7 +33,7 @@ const std::string kServing(kKxCellMonitorCellTypeServing);
 const std::string kNeighbor(kKxCellMonitorCellTypeNeighbor);
 
 TEST(UmtsCellSets, ActiveCellsBecomeRowsAndTheOtherSetsStayEmpty) {
-    gsm_testing::GsmGeneratorHarness harness;
+    testing::GeneratorHarness<ORV_GSMLogGenerator> harness;
     harness.feed(RecordBuilder(0x1234).build());
     for (const char* name : {"Detected Set", "Monitored Set", "Virtual Active Set"}) {
         harness.listSection(name)->append(rowOf({{"Scrambling Code", "old"}}));
@@ -56,7 +57,7 @@ TEST(UmtsCellSets, ActiveCellsBecomeRowsAndTheOtherSetsStayEmpty) {
 }
 
 TEST(UmtsCellSets, ScramblingCodeAndSetTypeShareByte8) {
-    ListSectionDecoder<ActiveSet> active;
+    ListSectionHarness<ActiveSet> active;
     // Cell entry bytes 7 = 0x34, 8 = 0x21: code ((0x21 & 0x1F) << 8) | 0x34 = 0x134 = 308, set type 1.
     PlistData record =
         RecordBuilder(0x417A).u8(15, 1).u8(16 + 7, 0x34).u8(16 + 8, 0x21).resize(16 + 15 + 44).build();
@@ -70,7 +71,7 @@ TEST(UmtsCellSets, ScramblingCodeAndSetTypeShareByte8) {
 }
 
 TEST(UmtsCellSets, RscpWithMinus1000AndMinus5) {
-    ListSectionDecoder<ActiveSet> active;
+    ListSectionHarness<ActiveSet> active;
     // 200000 lies in (166441, 209463]: E = -5; -48 - 106 - 5 = -159.
     active.feed(buildUmtsCellSetRecord({.powerReading = -1000,
                                         .cells = {{.scramblingCode = 1, .energyReadings = {200000, 9, 9}}}}),
@@ -80,7 +81,7 @@ TEST(UmtsCellSets, RscpWithMinus1000AndMinus5) {
 }
 
 TEST(UmtsCellSets, AllThreeReadingsZeroPassZero) {
-    ListSectionDecoder<ActiveSet> active;
+    ListSectionHarness<ActiveSet> active;
     // P = 25: trunc(537 / 10) = 53; 53 - 106 + 0 = -53.
     active.feed(buildUmtsCellSetRecord(
                     {.powerReading = 25, .cells = {{.scramblingCode = 2, .energyReadings = {0, 0, 0}}}}),
@@ -96,8 +97,8 @@ TEST(UmtsCellSets, AllThreeReadingsZeroPassZero) {
 }
 
 TEST(UmtsCellSets, ShortRecordIsIgnoredAndCountZeroEmpties) {
-    ListSectionDecoder<ActiveSet> active;
-    ListSectionDecoder<DetectedSet> detected;
+    ListSectionHarness<ActiveSet> active;
+    ListSectionHarness<DetectedSet> detected;
     active.section->append(rowOf({{"Scrambling Code", "old"}}));
     detected.section->append(rowOf({{"Scrambling Code", "old"}}));
     const PlistData fifteen = buildUmtsCellSetRecord({.length = 15});
@@ -114,7 +115,7 @@ TEST(UmtsCellSets, ShortRecordIsIgnoredAndCountZeroEmpties) {
 }
 
 TEST(UmtsCellSets, CountPastTheEndReadsZeroCells) {
-    ListSectionDecoder<ActiveSet> active;
+    ListSectionHarness<ActiveSet> active;
     // N = 2 in a 16-byte record: both cells and their energies read as zeros, so both are active-set cells.
     active.feed(buildUmtsCellSetRecord({.countOverride = 2}), 0x417A);
     EXPECT_EQ(active.rows(), rowsOf({
@@ -127,10 +128,10 @@ TEST(UmtsCellSets, CountPastTheEndReadsZeroCells) {
 }
 
 TEST(UmtsCellSets, EntryLinesAndUnknownCodes) {
-    ListSectionDecoder<ActiveSet> active;
-    ListSectionDecoder<DetectedSet> detected;
-    ListSectionDecoder<MonitoredSet> monitored;
-    ListSectionDecoder<VirtualActiveSet> virtualActive;
+    ListSectionHarness<ActiveSet> active;
+    ListSectionHarness<DetectedSet> detected;
+    ListSectionHarness<MonitoredSet> monitored;
+    ListSectionHarness<VirtualActiveSet> virtualActive;
     LogCapture capture;
     const PlistData record = buildUmtsCellSetRecord({});
     active.feed(record, 0x417B);
@@ -170,7 +171,7 @@ TEST(UmtsCellSets, ListAccessorsThrowAtTheCount) {
 }
 
 TEST(UMTSSet, RowsFromTheUmtsEntriesInTheirKeyOrder) {
-    ListSectionDecoder<UMTSSet> umtsSet;
+    ListSectionHarness<UMTSSet> umtsSet;
     LogCapture capture;
     umtsSet.feed(buildUmtsSetRecord({.cells = {{.downlinkFrequency = 10737,
                                                 .scramblingCode = 300,
@@ -203,7 +204,7 @@ TEST(UMTSSet, RowsFromTheUmtsEntriesInTheirKeyOrder) {
 }
 
 TEST(UMTSSet, ShortRecordIsIgnoredAndCountZeroEmpties) {
-    ListSectionDecoder<UMTSSet> umtsSet;
+    ListSectionHarness<UMTSSet> umtsSet;
     umtsSet.section->append(rowOf({{"UARFCN", "old"}}));
     umtsSet.feed(buildUmtsSetRecord({.cells = {{.scramblingCode = 1}}, .length = 14}), 0x4005);
     EXPECT_EQ(umtsSet.section->size(), 1u);
@@ -212,16 +213,16 @@ TEST(UMTSSet, ShortRecordIsIgnoredAndCountZeroEmpties) {
 }
 
 TEST(UMTSSet, CountPastTheEndKeepsItsRows) {
-    ListSectionDecoder<UMTSSet> umtsSet;
+    ListSectionHarness<UMTSSet> umtsSet;
     umtsSet.feed(buildUmtsSetRecord({.countOverride = 2, .length = 15}), 0x4005);
-    const gsm_testing::Row zeros = {
+    const testing::Row zeros = {
         {"Scrambling Code", "0"},    {"RSCP", "-21 dB"},     {"Energy Per Chip", "0.000000 dB"},
         {"Downlink Frequency", "0"}, {"Ranking Value", "0"}, {"Rank Cell RSCP", "0 dB"}};
     EXPECT_EQ(umtsSet.rows(), rowsOf({zeros, zeros}));
 }
 
 TEST(UMTSSet, CellMonitorUmtsNeighbours) {
-    ListSectionDecoder<UMTSSet> umtsSet;
+    ListSectionHarness<UMTSSet> umtsSet;
     LogCapture capture;
     umtsSet.feed(
         buildCellMonitorEntries({
@@ -253,7 +254,7 @@ TEST(UMTSSet, CellMonitorUmtsNeighbours) {
 }
 
 TEST(UMTSSet, CellMonitorFailuresLeaveKeysOut) {
-    ListSectionDecoder<UMTSSet> umtsSet;
+    ListSectionHarness<UMTSSet> umtsSet;
     auto cells = PlistArray::create();
     PlistValue first =
         cellMonitorEntryDictionary({.technology = kUmts, .cellType = kNeighbor, .rscp = -100, .ecn0 = -12});
@@ -274,7 +275,7 @@ TEST(UMTSSet, CellMonitorFailuresLeaveKeysOut) {
 }
 
 TEST(UMTSSet, UnparsableCellMonitorEmptiesTheSection) {
-    ListSectionDecoder<UMTSSet> umtsSet;
+    ListSectionHarness<UMTSSet> umtsSet;
     umtsSet.section->append(rowOf({{"UARFCN", "old"}}));
     LogCapture capture;
     const std::uint8_t truncated[] = {'b', 'p', 'l', 'i', 's', 't', '0', '0', 0xD1};
@@ -286,7 +287,7 @@ TEST(UMTSSet, UnparsableCellMonitorEmptiesTheSection) {
 }
 
 TEST(UMTSSet, UnknownCodeIsLogged) {
-    ListSectionDecoder<UMTSSet> umtsSet;
+    ListSectionHarness<UMTSSet> umtsSet;
     LogCapture capture;
     umtsSet.feed(buildUmtsSetRecord({}), 0xFF0003);
     EXPECT_EQ(capture.texts(),

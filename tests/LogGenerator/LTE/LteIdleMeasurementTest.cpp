@@ -5,14 +5,14 @@
 #include "LogGenerator/LTE/ServingCellMeasurement.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/LteRecords.h"
-#include "tests/LogGenerator/LTE/DecoderTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
 namespace {
 
-using testing::BoundKeySection;
-using testing::BoundListSection;
+using testing::KeySectionHarness;
+using testing::ListSectionHarness;
 using testing::packetWithPayload;
 using testing::zeroPacket;
 
@@ -46,7 +46,7 @@ TEST(LteServingMeasurement, SectionAndCode) {
 }
 
 TEST(LteServingMeasurement, EveryFieldInOrder) {
-    BoundKeySection<ServingCellMeasurement> bound;
+    KeySectionHarness<ServingCellMeasurement> bound;
     const auto packet = handWrittenServingMeasurement();
     ASSERT_EQ(packet.size(), 33u);
     testing::LogCapture capture;
@@ -79,7 +79,7 @@ TEST(LteServingMeasurement, EveryFieldInOrder) {
 }
 
 TEST(LteServingMeasurement, NotPresentValues) {
-    BoundKeySection<ServingCellMeasurement> bound;
+    KeySectionHarness<ServingCellMeasurement> bound;
     LteIdleServingMeasurementRecord record;
     record.pMax = 64;
     record.sIntraSearch = 32;
@@ -102,7 +102,7 @@ TEST(LteServingMeasurement, NotPresentValues) {
 }
 
 TEST(LteServingMeasurement, MaxUeTxPowerIsSixBitsAndNeverNotPresent) {
-    BoundKeySection<ServingCellMeasurement> bound;
+    KeySectionHarness<ServingCellMeasurement> bound;
     // Bits 6..12 of bytes 27..28 would read 64 if the field were seven bits wide: only bit 4 of byte 28 is
     // set.
     auto packet = zeroPacket(kServingMeasurement, 33);
@@ -114,7 +114,7 @@ TEST(LteServingMeasurement, MaxUeTxPowerIsSixBitsAndNeverNotPresent) {
 }
 
 TEST(LteServingMeasurement, ThirtyTwoBytesChangeNothingAndOtherCodesAreReported) {
-    BoundKeySection<ServingCellMeasurement> bound;
+    KeySectionHarness<ServingCellMeasurement> bound;
     auto packet = handWrittenServingMeasurement();
     packet.pop_back();
     testing::LogCapture capture;
@@ -134,7 +134,7 @@ TEST(LteNeighbourMeasurement, SectionsAndCodes) {
 }
 
 TEST(LteNeighbourMeasurement, ScalarsInOrder) {
-    BoundKeySection<NeighborMeasurementMisc> bound;
+    KeySectionHarness<NeighborMeasurementMisc> bound;
     bound.feed(handWrittenNeighbourMeasurement(), kNeighbourMeasurement);
     EXPECT_EQ(testing::keysOf(*bound.section), (std::vector<std::string>{"Version", "E-ARFCN", "Qrxlevmin"}));
     EXPECT_EQ(bound.text("Version"), "3");
@@ -143,7 +143,7 @@ TEST(LteNeighbourMeasurement, ScalarsInOrder) {
 }
 
 TEST(LteNeighbourMeasurement, EveryEntryFieldWithHalfDbLevelsAndRepeatedAntennaOffsets) {
-    BoundListSection<NeighborCellsList> bound;
+    ListSectionHarness<NeighborCellsList> bound;
     testing::LogCapture capture;
     bound.feed(handWrittenNeighbourMeasurement(), kNeighbourMeasurement);
     ASSERT_EQ(bound.section->size(), 2u);
@@ -190,7 +190,7 @@ TEST(LteNeighbourMeasurement, EveryEntryFieldWithHalfDbLevelsAndRepeatedAntennaO
 }
 
 TEST(LteNeighbourMeasurement, CountBitsZeroYieldOneEntry) {
-    BoundListSection<NeighborCellsList> bound;
+    ListSectionHarness<NeighborCellsList> bound;
     auto packet = zeroPacket(kNeighbourMeasurement, 21);
     packet[19] = 0x3F;  // Qrxlevmin bits all set, count bits 0
     packet[20] = 0xF8;  // bits 11..15 of the count word: outside the count
@@ -205,7 +205,7 @@ TEST(LteNeighbourMeasurement, CountBitsZeroYieldOneEntry) {
 }
 
 TEST(LteNeighbourMeasurement, MaximumCountPointingPastTheEndReadsZeros) {
-    BoundListSection<NeighborCellsList> bound;
+    ListSectionHarness<NeighborCellsList> bound;
     LteIdleNeighbourMeasurementRecord record;
     record.neighbours = {{300, 10, 20, 30, 40, 50, 60, 70, 80, 90}};
     record.countBitsOverride = 31;
@@ -228,8 +228,8 @@ TEST(LteNeighbourMeasurement, MaximumCountPointingPastTheEndReadsZeros) {
 }
 
 TEST(LteNeighbourMeasurement, TwentyBytesChangeNothingAndOtherCodesAreReported) {
-    BoundKeySection<NeighborMeasurementMisc> misc;
-    BoundListSection<NeighborCellsList> list;
+    KeySectionHarness<NeighborMeasurementMisc> misc;
+    ListSectionHarness<NeighborCellsList> list;
     list.seed();
     auto packet = handWrittenNeighbourMeasurement();
     packet.resize(20);

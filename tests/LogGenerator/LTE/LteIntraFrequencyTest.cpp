@@ -5,14 +5,14 @@
 #include "LogGenerator/LTE/MeasuredNeighborCells.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/LteRecords.h"
-#include "tests/LogGenerator/LTE/DecoderTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
 namespace {
 
-using testing::BoundKeySection;
-using testing::BoundListSection;
+using testing::KeySectionHarness;
+using testing::ListSectionHarness;
 using testing::packetWithPayload;
 using testing::zeroPacket;
 
@@ -38,7 +38,7 @@ TEST(LteIntraFrequency, SectionsAndCodes) {
 }
 
 TEST(LteIntraFrequency, ServingScalarsInOrder) {
-    BoundKeySection<ConnectedModeMeasurementMisc> bound;
+    KeySectionHarness<ConnectedModeMeasurementMisc> bound;
     const auto packet = handWrittenIntraFrequency();
     ASSERT_EQ(packet.size(), 43u);
     testing::LogCapture capture;
@@ -56,8 +56,8 @@ TEST(LteIntraFrequency, ServingScalarsInOrder) {
 }
 
 TEST(LteIntraFrequency, MeasuredNeighboursAndDetectedCellAfterThem) {
-    BoundListSection<MeasuredNeighborCells> measured;
-    BoundListSection<DetectedCells> detected;
+    ListSectionHarness<MeasuredNeighborCells> measured;
+    ListSectionHarness<DetectedCells> detected;
     const auto packet = handWrittenIntraFrequency();
     measured.feed(packet, kIntraFrequency);
     detected.feed(packet, kIntraFrequency);
@@ -76,9 +76,9 @@ TEST(LteIntraFrequency, MeasuredNeighboursAndDetectedCellAfterThem) {
 }
 
 TEST(LteIntraFrequency, ZeroCountsSetTheScalarsAndEmptyBothLists) {
-    BoundKeySection<ConnectedModeMeasurementMisc> misc;
-    BoundListSection<MeasuredNeighborCells> measured;
-    BoundListSection<DetectedCells> detected;
+    KeySectionHarness<ConnectedModeMeasurementMisc> misc;
+    ListSectionHarness<MeasuredNeighborCells> measured;
+    ListSectionHarness<DetectedCells> detected;
     measured.seed();
     detected.seed();
     LteIntraFrequencyRecord record;
@@ -103,8 +103,8 @@ TEST(LteIntraFrequency, ZeroCountsSetTheScalarsAndEmptyBothLists) {
 }
 
 TEST(LteIntraFrequency, BuiltRecordWithSeveralCells) {
-    BoundListSection<MeasuredNeighborCells> measured;
-    BoundListSection<DetectedCells> detected;
+    ListSectionHarness<MeasuredNeighborCells> measured;
+    ListSectionHarness<DetectedCells> detected;
     LteIntraFrequencyRecord record;
     record.measured = {{11, 4, 8}, {22, 560, 1}, {33, 0xFFFF, 0xFFFF}};
     record.detected = {101, 202, 303, 404};
@@ -125,8 +125,8 @@ TEST(LteIntraFrequency, BuiltRecordWithSeveralCells) {
 }
 
 TEST(LteIntraFrequency, CountsPointingPastTheEndReadZeros) {
-    BoundListSection<MeasuredNeighborCells> measured;
-    BoundListSection<DetectedCells> detected;
+    ListSectionHarness<MeasuredNeighborCells> measured;
+    ListSectionHarness<DetectedCells> detected;
     auto packet = zeroPacket(kIntraFrequency, 29);
     packet[27] = 255;
     packet[28] = 255;
@@ -141,9 +141,9 @@ TEST(LteIntraFrequency, CountsPointingPastTheEndReadZeros) {
 }
 
 TEST(LteIntraFrequency, TwentyEightBytesChangeNothing) {
-    BoundKeySection<ConnectedModeMeasurementMisc> misc;
-    BoundListSection<MeasuredNeighborCells> measured;
-    BoundListSection<DetectedCells> detected;
+    KeySectionHarness<ConnectedModeMeasurementMisc> misc;
+    ListSectionHarness<MeasuredNeighborCells> measured;
+    ListSectionHarness<DetectedCells> detected;
     measured.seed();
     detected.seed();
     auto packet = handWrittenIntraFrequency();
@@ -160,9 +160,9 @@ TEST(LteIntraFrequency, TwentyEightBytesChangeNothing) {
 }
 
 TEST(LteIntraFrequency, OtherCodesAreReportedAndChangeNothing) {
-    BoundKeySection<ConnectedModeMeasurementMisc> misc;
-    BoundListSection<MeasuredNeighborCells> measured;
-    BoundListSection<DetectedCells> detected;
+    KeySectionHarness<ConnectedModeMeasurementMisc> misc;
+    ListSectionHarness<MeasuredNeighborCells> measured;
+    ListSectionHarness<DetectedCells> detected;
     measured.seed();
     testing::LogCapture capture;
     misc.feed(handWrittenIntraFrequency(), 0xB17F);

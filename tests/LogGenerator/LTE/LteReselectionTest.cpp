@@ -4,14 +4,16 @@
 #include "LogGenerator/LTE/ReselectionCandidatesMisc.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/LteRecords.h"
-#include "tests/LogGenerator/LTE/DecoderTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
 namespace {
 
-using testing::BoundKeySection;
-using testing::BoundListSection;
+using testing::Entries;
+using testing::entriesOf;
+using testing::KeySectionHarness;
+using testing::ListSectionHarness;
 using testing::packetWithPayload;
 using testing::zeroPacket;
 
@@ -26,15 +28,6 @@ std::vector<std::uint8_t> handWrittenCandidates() {
                               0xE8, 0x03, 0x01, 0x00, 0x80, 0x0C, 0x00, 0x00, 0x9C, 0x18, 0xD5, 0xFA});
 }
 
-std::vector<std::pair<std::string, std::string>> entriesOf(const PlistDictionary& row) {
-    std::vector<std::pair<std::string, std::string>> entries;
-    for (const auto& [key, value] : row) {
-        entries.emplace_back(key, value.string() ? *value.string() : "<not a string>");
-    }
-    return entries;
-}
-using Entries = std::vector<std::pair<std::string, std::string>>;
-
 TEST(LteReselection, SectionsAndCodes) {
     EXPECT_EQ(ReselectionCandidatesMisc().getSectionName(), "Reselection Candidates");
     EXPECT_EQ(ReselectionCandidatesList().getSectionName(), "Reselection Candidates List");
@@ -44,7 +37,7 @@ TEST(LteReselection, SectionsAndCodes) {
 }
 
 TEST(LteReselection, ServingScalars) {
-    BoundKeySection<ReselectionCandidatesMisc> bound;
+    KeySectionHarness<ReselectionCandidatesMisc> bound;
     testing::LogCapture capture;
     bound.feed(handWrittenCandidates(), kReselection);
     EXPECT_EQ(testing::keysOf(*bound.section),
@@ -56,7 +49,7 @@ TEST(LteReselection, ServingScalars) {
 }
 
 TEST(LteReselection, CandidatesReadTheirFieldsFromTheNextSlot) {
-    BoundListSection<ReselectionCandidatesList> bound;
+    ListSectionHarness<ReselectionCandidatesList> bound;
     testing::LogCapture capture;
     bound.feed(handWrittenCandidates(), kReselection);
     ASSERT_EQ(bound.section->size(), 3u);
@@ -77,7 +70,7 @@ TEST(LteReselection, CandidatesReadTheirFieldsFromTheNextSlot) {
 }
 
 TEST(LteReselection, GeranCandidateFromBytesFourToSeven) {
-    BoundListSection<ReselectionCandidatesList> bound;
+    ListSectionHarness<ReselectionCandidatesList> bound;
     auto packet = zeroPacket(kReselection, 29);
     packet[19] = 1;
     packet[21] = 4;  // priority
@@ -101,7 +94,7 @@ TEST(LteReselection, CdmaCandidatesDifferOnlyInTheirName) {
         const char* name;
     } cases[] = {{3, "CDMA1XRTT"}, {4, "CDMAHRPD"}};
     for (const auto& item : cases) {
-        BoundListSection<ReselectionCandidatesList> bound;
+        ListSectionHarness<ReselectionCandidatesList> bound;
         // Band byte 14 at 25; bytes 26..28 between band and channel; channel 775 at 29; pilot 420 at 31.
         const auto packet =
             packetWithPayload(kReselection, {0,        0,    0,    0,    0,    0,    0x01, 0x00, 0x09, 0x00,
@@ -117,7 +110,7 @@ TEST(LteReselection, CdmaCandidatesDifferOnlyInTheirName) {
 }
 
 TEST(LteReselection, UnknownTechnologyShowsQuestionMarksAndNoFields) {
-    BoundListSection<ReselectionCandidatesList> bound;
+    ListSectionHarness<ReselectionCandidatesList> bound;
     const auto packet =
         packetWithPayload(kReselection, {0,    0,    0,    0,    0,    0,    0x01, 0x00, 0x0C, 0x00,
                                          0x09, 0x00, 0x11, 0x22, 0x33, 0x44, 0x55, 0x66, 0x77, 0x88});
@@ -127,7 +120,7 @@ TEST(LteReselection, UnknownTechnologyShowsQuestionMarksAndNoFields) {
 }
 
 TEST(LteReselection, OnlyTheLowByteOfTheCountCounts) {
-    BoundListSection<ReselectionCandidatesList> bound;
+    ListSectionHarness<ReselectionCandidatesList> bound;
     bound.seed();
     LteReselectionCandidatesRecord record;
     record.candidates = {{1, 0, 2, 3, 0, 0}};
@@ -145,7 +138,7 @@ TEST(LteReselection, OnlyTheLowByteOfTheCountCounts) {
 }
 
 TEST(LteReselection, BuiltCandidatesOfEveryTechnology) {
-    BoundListSection<ReselectionCandidatesList> bound;
+    ListSectionHarness<ReselectionCandidatesList> bound;
     LteReselectionCandidatesRecord record;
     // Each candidate but the last has its fields overwritten by the next header: only the last keeps its own.
     record.candidates = {{7, 2, 0, 0, 0, 0}, {300, 1, 0, 0, 0, 0}, {5, 4, 620, 96, 3, 0}};
@@ -168,7 +161,7 @@ TEST(LteReselection, BuiltCandidatesOfEveryTechnology) {
 }
 
 TEST(LteReselection, CountPointingPastTheEndReadsZeros) {
-    BoundListSection<ReselectionCandidatesList> bound;
+    ListSectionHarness<ReselectionCandidatesList> bound;
     auto packet = zeroPacket(kReselection, 21);
     packet[19] = 0xFF;
     bound.feed(packet, kReselection);
@@ -180,8 +173,8 @@ TEST(LteReselection, CountPointingPastTheEndReadsZeros) {
 }
 
 TEST(LteReselection, TwentyBytesChangeNothingAndOtherCodesAreReported) {
-    BoundKeySection<ReselectionCandidatesMisc> misc;
-    BoundListSection<ReselectionCandidatesList> list;
+    KeySectionHarness<ReselectionCandidatesMisc> misc;
+    ListSectionHarness<ReselectionCandidatesList> list;
     list.seed();
     auto packet = handWrittenCandidates();
     packet.resize(20);

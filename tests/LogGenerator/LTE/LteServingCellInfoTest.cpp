@@ -5,13 +5,13 @@
 #include "core/platform/SystemLog.h"
 #include "logfile/records/LteRecords.h"
 #include "logfile/records/RecordBuilder.h"
-#include "tests/LogGenerator/LTE/DecoderTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
 namespace {
 
-using testing::BoundKeySection;
+using testing::KeySectionHarness;
 using testing::packetWithPayload;
 using testing::zeroPacket;
 
@@ -46,7 +46,7 @@ TEST(LteServingCellInfo, SectionAndCodes) {
 }
 
 TEST(LteServingCellInfo, ServingCellRecordWritesEveryKeyInOrder) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     const auto packet = handWrittenServingCellInfo();
     ASSERT_EQ(packet.size(), 38u);
     testing::LogCapture capture;
@@ -68,7 +68,7 @@ TEST(LteServingCellInfo, ServingCellRecordWritesEveryKeyInOrder) {
 }
 
 TEST(LteServingCellInfo, BandwidthNamesAndUnknown) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     const struct {
         std::uint8_t blocks;
         const char* name;
@@ -91,7 +91,7 @@ TEST(LteServingCellInfo, BandwidthNamesAndUnknown) {
 }
 
 TEST(LteServingCellInfo, ThirtyTwoBitFieldsShowNegativeFromTwoToTheThirtyFirst) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     LteServingCellInfoRecord record;
     record.cellIdentity = 0x80000000u;
     record.frequencyBandIndicator = 0xFFFFFFFEu;
@@ -101,7 +101,7 @@ TEST(LteServingCellInfo, ThirtyTwoBitFieldsShowNegativeFromTwoToTheThirtyFirst) 
 }
 
 TEST(LteServingCellInfo, ThirtySevenByteRecordChangesNothing) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     bound.section->set("Physical Cell ID", "old");
     auto packet = handWrittenServingCellInfo();
     packet.pop_back();
@@ -113,7 +113,7 @@ TEST(LteServingCellInfo, ThirtySevenByteRecordChangesNothing) {
 }
 
 TEST(LteServingCellInfo, MasterInformationStoresAntennasAndStillReportsTheCode) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     auto packet = zeroPacket(kMasterInformation, 22);
     packet[20] = 2;
     packet[19] = 7;  // neighbours of the antenna byte must not leak into it
@@ -128,7 +128,7 @@ TEST(LteServingCellInfo, MasterInformationStoresAntennasAndStillReportsTheCode) 
 }
 
 TEST(LteServingCellInfo, ShortMasterInformationIsDroppedSilently) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     auto packet = zeroPacket(kMasterInformation, 21);
     packet[20] = 4;
     testing::LogCapture capture;
@@ -143,7 +143,7 @@ TEST(LteServingCellInfo, ShortMasterInformationIsDroppedSilently) {
 }
 
 TEST(LteServingCellInfo, UnknownCodeIsReportedAndChangesNothing) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     testing::LogCapture capture;
     bound.feed(handWrittenServingCellInfo(), 0xB0C3);
     EXPECT_TRUE(bound.section->empty());
@@ -153,7 +153,7 @@ TEST(LteServingCellInfo, UnknownCodeIsReportedAndChangesNothing) {
 }
 
 TEST(LteServingCellInfo, CellMonitorServingCellWritesItsFiveKeys) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     testing::LogCapture capture;
     bound.feed(buildLteCellMonitorRecord({servingLteCell()}), kCellMonitor);
     EXPECT_EQ(testing::keysOf(*bound.section),
@@ -168,7 +168,7 @@ TEST(LteServingCellInfo, CellMonitorServingCellWritesItsFiveKeys) {
 }
 
 TEST(LteServingCellInfo, ServingCellRecordRemovesUarfcnAndTheNextArrayWritesItAgain) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     bound.feed(buildLteCellMonitorRecord({servingLteCell()}), kCellMonitor);
     ASSERT_EQ(bound.text("UARFCN"), "1300");
     bound.feed(handWrittenServingCellInfo(), kServingCellInfo);
@@ -183,7 +183,7 @@ TEST(LteServingCellInfo, ServingCellRecordRemovesUarfcnAndTheNextArrayWritesItAg
 }
 
 TEST(LteServingCellInfo, ArrayWhoseOnlyLteCellIsANeighbourChangesNothingAndLogsNothing) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     LteCellMonitorCell neighbour = servingLteCell();
     neighbour.cellType = std::string(kKxCellMonitorCellTypeNeighbor);
     LteCellMonitorCell umtsServing = servingLteCell();
@@ -195,7 +195,7 @@ TEST(LteServingCellInfo, ArrayWhoseOnlyLteCellIsANeighbourChangesNothingAndLogsN
 }
 
 TEST(LteServingCellInfo, ServingCellWithoutTacLogsAndStoresTheOtherFour) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     bound.section->set("Tracking Area Code", "77");
     LteCellMonitorCell cell = servingLteCell();
     cell.trackingAreaCode.reset();
@@ -211,7 +211,7 @@ TEST(LteServingCellInfo, ServingCellWithoutTacLogsAndStoresTheOtherFour) {
 }
 
 TEST(LteServingCellInfo, EveryMissingNumberHasItsMessage) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     LteCellMonitorCell cell;
     cell.technology = std::string(kKxCellMonitorRadioAccessTechnologyLTE);
     cell.cellType = std::string(kKxCellMonitorCellTypeServing);
@@ -227,7 +227,7 @@ TEST(LteServingCellInfo, EveryMissingNumberHasItsMessage) {
 }
 
 TEST(LteServingCellInfo, TheFirstServingLteCellWinsAndStringNumbersCountAsMissing) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     auto cells = PlistArray::create();
     // An entry without the cell-type key is skipped.
     auto untyped = lteCellMonitorDictionary(servingLteCell());
@@ -251,7 +251,7 @@ TEST(LteServingCellInfo, TheFirstServingLteCellWinsAndStringNumbersCountAsMissin
 }
 
 TEST(LteServingCellInfo, UnreadableOrEmptyCellArrays) {
-    BoundKeySection<LTEServingCellInfo> bound;
+    KeySectionHarness<LTEServingCellInfo> bound;
     {
         testing::LogCapture capture;
         bound.feed(packetWithPayload(0x0001, {'n', 'o', 't', ' ', 'a', ' ', 'p', 'l', 'i', 's', 't'}),

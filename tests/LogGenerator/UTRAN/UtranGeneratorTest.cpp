@@ -15,7 +15,7 @@
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/records/UtranRecords.h"
-#include "tests/LogGenerator/LTE/DecoderTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 #include "tests/support/TestPaths.h"
 

@@ -6,28 +6,21 @@
 #include "LogGenerator/UTRAN/UTRANNeighbhorMeasurements.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/UtranRecords.h"
-#include "tests/LogGenerator/LTE/DecoderTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
 namespace {
 
-using testing::BoundListSection;
+using testing::Entries;
+using testing::entriesOf;
+using testing::ListSectionHarness;
 using testing::packetWithPayload;
 using testing::zeroPacket;
 
 constexpr std::int32_t kNeighbours = 0xD00A;
 constexpr std::int32_t kGsmNeighbours = 0xD00E;
 constexpr std::int32_t kChannelQuality = 0xD00C;
-
-using Entries = std::vector<std::pair<std::string, std::string>>;
-Entries entriesOf(const PlistDictionary& row) {
-    Entries entries;
-    for (const auto& [key, value] : row) {
-        entries.emplace_back(key, value.string() ? *value.string() : "<not a string>");
-    }
-    return entries;
-}
 
 std::vector<std::string> sirOf(const PlistDictionary& row) {
     std::vector<std::string> values;
@@ -66,7 +59,7 @@ TEST(UtranMeasurements, SectionsAndCodes) {
 }
 
 TEST(UtranNeighbours, EveryEntryField) {
-    BoundListSection<UTRANNeighbhorMeasurements> bound;
+    ListSectionHarness<UTRANNeighbhorMeasurements> bound;
     testing::LogCapture capture;
     bound.feed(handWrittenNeighbours(), kNeighbours);
     ASSERT_EQ(bound.section->size(), 2u);
@@ -84,7 +77,7 @@ TEST(UtranNeighbours, EveryEntryField) {
 }
 
 TEST(UtranNeighbours, ByteSixteenThreeYieldsOneEntryAt168) {
-    BoundListSection<UTRANNeighbhorMeasurements> bound;
+    ListSectionHarness<UTRANNeighbhorMeasurements> bound;
     auto packet = handWrittenNeighbours();
     packet[16] = 0x03;
     bound.feed(packet, kNeighbours);
@@ -94,7 +87,7 @@ TEST(UtranNeighbours, ByteSixteenThreeYieldsOneEntryAt168) {
 }
 
 TEST(UtranNeighbours, StatusNames) {
-    BoundListSection<UTRANNeighbhorMeasurements> bound;
+    ListSectionHarness<UTRANNeighbhorMeasurements> bound;
     UtranNeighbourMeasurementRecord record;
     record.neighbours = {{1, 2, 3, 0, false}, {4, 5, 6, 2, true}, {16383, 127, 255, 3, true}};
     bound.feed(buildUtranNeighbourMeasurementRecord(record), kNeighbours);
@@ -111,7 +104,7 @@ TEST(UtranNeighbours, StatusNames) {
 }
 
 TEST(UtranNeighbours, ZeroCountEmptiesTheList) {
-    BoundListSection<UTRANNeighbhorMeasurements> bound;
+    ListSectionHarness<UTRANNeighbhorMeasurements> bound;
     bound.seed();
     auto packet = handWrittenNeighbours();
     packet[16] = 0x01;
@@ -120,7 +113,7 @@ TEST(UtranNeighbours, ZeroCountEmptiesTheList) {
 }
 
 TEST(UtranNeighbours, CountCannotExceed127AndEntriesPastTheEndReadZeros) {
-    BoundListSection<UTRANNeighbhorMeasurements> bound;
+    ListSectionHarness<UTRANNeighbhorMeasurements> bound;
     auto packet = zeroPacket(kNeighbours, 21);
     packet[16] = 0xFF;
     bound.feed(packet, kNeighbours);
@@ -133,7 +126,7 @@ TEST(UtranNeighbours, CountCannotExceed127AndEntriesPastTheEndReadZeros) {
 }
 
 TEST(UtranNeighbours, TwentyBytesAndOtherCodesChangeNothingSilently) {
-    BoundListSection<UTRANNeighbhorMeasurements> bound;
+    ListSectionHarness<UTRANNeighbhorMeasurements> bound;
     bound.seed();
     auto packet = zeroPacket(kNeighbours, 20);
     packet[16] = 0x02;
@@ -146,7 +139,7 @@ TEST(UtranNeighbours, TwentyBytesAndOtherCodesChangeNothingSilently) {
 }
 
 TEST(UtranGsmNeighbours, TheListIsEmptyAfterEveryRecord) {
-    BoundListSection<GSMNeighbhorMeasurements> bound;
+    ListSectionHarness<GSMNeighbhorMeasurements> bound;
     bound.seed();
     // Two entries written out: (cell 11578, band bit set, BSIC invalid, NCC 5, BCC 3, ARFCN 512, RSSI -85)
     // and (4097, 0, 1, 7, 0, 1023, -110).
@@ -167,7 +160,7 @@ TEST(UtranGsmNeighbours, TheListIsEmptyAfterEveryRecord) {
 }
 
 TEST(UtranGsmNeighbours, ShortRecordsAndOtherCodesLeaveTheListAlone) {
-    BoundListSection<GSMNeighbhorMeasurements> bound;
+    ListSectionHarness<GSMNeighbhorMeasurements> bound;
     bound.seed();
     bound.feed(zeroPacket(kGsmNeighbours, 16), kGsmNeighbours);
     bound.feed(zeroPacket(kGsmNeighbours, 17), kNeighbours);
@@ -190,7 +183,7 @@ std::vector<std::uint8_t> handWrittenChannelQuality() {
 }
 
 TEST(UtranChannelQuality, TransportChannelBler) {
-    BoundListSection<TRCHBLERMeasurement> bound;
+    ListSectionHarness<TRCHBLERMeasurement> bound;
     testing::LogCapture capture;
     bound.feed(handWrittenChannelQuality(), kChannelQuality);
     ASSERT_EQ(bound.section->size(), 3u);
@@ -202,7 +195,7 @@ TEST(UtranChannelQuality, TransportChannelBler) {
 }
 
 TEST(UtranChannelQuality, CompositeChannelsBehindThirtyFourBytesPerTransportChannel) {
-    BoundListSection<CCTRCHSIRMeasurement> bound;
+    ListSectionHarness<CCTRCHSIRMeasurement> bound;
     testing::LogCapture capture;
     bound.feed(handWrittenChannelQuality(), kChannelQuality);
     ASSERT_EQ(bound.section->size(), 2u);
@@ -218,7 +211,7 @@ TEST(UtranChannelQuality, CompositeChannelsBehindThirtyFourBytesPerTransportChan
 }
 
 TEST(UtranChannelQuality, TwoTransportChannelsPutTheOnlyCompositeEntryAt357) {
-    BoundListSection<CCTRCHSIRMeasurement> bound;
+    ListSectionHarness<CCTRCHSIRMeasurement> bound;
     auto packet = zeroPacket(kChannelQuality, 365);
     packet[14] = 0x80;
     packet[15] = 0x10;
@@ -233,8 +226,8 @@ TEST(UtranChannelQuality, TwoTransportChannelsPutTheOnlyCompositeEntryAt357) {
 }
 
 TEST(UtranChannelQuality, TransportCountSpanningTwoBytes) {
-    BoundListSection<TRCHBLERMeasurement> trch;
-    BoundListSection<CCTRCHSIRMeasurement> cctrch;
+    ListSectionHarness<TRCHBLERMeasurement> trch;
+    ListSectionHarness<CCTRCHSIRMeasurement> cctrch;
     UtranChannelQualityRecord record;
     // n = 37 = 0b100101: bits 6..7 of byte 14 hold 01, bits 0..3 of byte 15 hold 1001; ten composite
     // channels.
@@ -260,8 +253,8 @@ TEST(UtranChannelQuality, TransportCountSpanningTwoBytes) {
 }
 
 TEST(UtranChannelQuality, MaximumCountsPointingPastTheEndReadZeros) {
-    BoundListSection<TRCHBLERMeasurement> trch;
-    BoundListSection<CCTRCHSIRMeasurement> cctrch;
+    ListSectionHarness<TRCHBLERMeasurement> trch;
+    ListSectionHarness<CCTRCHSIRMeasurement> cctrch;
     auto packet = zeroPacket(kChannelQuality, 17);
     packet[14] = 0xFF;
     packet[15] = 0xFF;
@@ -274,8 +267,8 @@ TEST(UtranChannelQuality, MaximumCountsPointingPastTheEndReadZeros) {
 }
 
 TEST(UtranChannelQuality, SixteenBytesAndOtherCodesChangeNothingSilently) {
-    BoundListSection<TRCHBLERMeasurement> trch;
-    BoundListSection<CCTRCHSIRMeasurement> cctrch;
+    ListSectionHarness<TRCHBLERMeasurement> trch;
+    ListSectionHarness<CCTRCHSIRMeasurement> cctrch;
     trch.seed();
     cctrch.seed();
     auto packet = handWrittenChannelQuality();

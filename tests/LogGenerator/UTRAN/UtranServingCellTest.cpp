@@ -5,13 +5,13 @@
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/SystemLog.h"
 #include "logfile/records/UtranRecords.h"
-#include "tests/LogGenerator/LTE/DecoderTestSupport.h"
+#include "tests/LogGenerator/DecoderHarness.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
 namespace {
 
-using testing::BoundKeySection;
+using testing::KeySectionHarness;
 using testing::packetWithPayload;
 using testing::zeroPacket;
 
@@ -45,7 +45,7 @@ TEST(UtranRrcState, SectionAndCode) {
 }
 
 TEST(UtranRrcState, ValidModeIsShownAndLogged) {
-    BoundKeySection<RRC_State> bound;
+    KeySectionHarness<RRC_State> bound;
     testing::LogCapture capture;
     bound.feed(packetWithPayload(kRrcState, {0x01, 0x03}), kRrcState);
     EXPECT_EQ(bound.text("State"), "Cell DCH");
@@ -56,7 +56,7 @@ TEST(UtranRrcState, ValidModeIsShownAndLogged) {
 }
 
 TEST(UtranRrcState, EveryModeName) {
-    BoundKeySection<RRC_State> bound;
+    KeySectionHarness<RRC_State> bound;
     const struct {
         std::uint8_t mode;
         const char* name;
@@ -73,7 +73,7 @@ TEST(UtranRrcState, EveryModeName) {
 }
 
 TEST(UtranRrcState, ModeIsUnknownUnlessTheValidByteIsOne) {
-    BoundKeySection<RRC_State> bound;
+    KeySectionHarness<RRC_State> bound;
     testing::LogCapture capture;
     bound.feed(packetWithPayload(kRrcState, {0x00, 0x03}), kRrcState);
     EXPECT_EQ(bound.text("State"), "Unknown RRC Mode");
@@ -84,7 +84,7 @@ TEST(UtranRrcState, ModeIsUnknownUnlessTheValidByteIsOne) {
 }
 
 TEST(UtranRrcState, ShortRecordIsReportedAndStillDecoded) {
-    BoundKeySection<RRC_State> bound;
+    KeySectionHarness<RRC_State> bound;
     bound.section->set("State", "Cell DCH");
     testing::LogCapture capture;
     // 14 bytes: byte 13 says the mode is valid, the mode byte itself is missing and reads as zero.
@@ -101,7 +101,7 @@ TEST(UtranRrcState, ShortRecordIsReportedAndStillDecoded) {
 }
 
 TEST(UtranRrcState, OtherCodesAreIgnoredSilently) {
-    BoundKeySection<RRC_State> bound;
+    KeySectionHarness<RRC_State> bound;
     testing::LogCapture capture;
     bound.feed(packetWithPayload(kRrcState, {0x01, 0x03}), 0xD0E2);
     EXPECT_TRUE(bound.section->empty());
@@ -115,7 +115,7 @@ TEST(UtranServingCell, SectionAndCodes) {
 }
 
 TEST(UtranServingCell, RecordFieldsInOrder) {
-    BoundKeySection<UTRANServingCellInfo> bound;
+    KeySectionHarness<UTRANServingCellInfo> bound;
     const auto packet = handWrittenServingCell();
     ASSERT_EQ(packet.size(), 26u);
     testing::LogCapture capture;
@@ -133,7 +133,7 @@ TEST(UtranServingCell, RecordFieldsInOrder) {
 }
 
 TEST(UtranServingCell, AllCallsWhenBitZeroIsClear) {
-    BoundKeySection<UTRANServingCellInfo> bound;
+    KeySectionHarness<UTRANServingCellInfo> bound;
     UtranServingCellRecord record;
     record.cellId = 0xFFFFFFFFu;
     bound.feed(buildUtranServingCellRecord(record), kServingCell);
@@ -146,7 +146,7 @@ TEST(UtranServingCell, AllCallsWhenBitZeroIsClear) {
 }
 
 TEST(UtranServingCell, TwentyFiveBytesChangeNothingAndOtherCodesAreIgnored) {
-    BoundKeySection<UTRANServingCellInfo> bound;
+    KeySectionHarness<UTRANServingCellInfo> bound;
     auto packet = handWrittenServingCell();
     packet.pop_back();
     testing::LogCapture capture;
@@ -157,7 +157,7 @@ TEST(UtranServingCell, TwentyFiveBytesChangeNothingAndOtherCodesAreIgnored) {
 }
 
 TEST(UtranServingCell, CellMonitorUarfcnGoesUnderBothKeys) {
-    BoundKeySection<UTRANServingCellInfo> bound;
+    KeySectionHarness<UTRANServingCellInfo> bound;
     testing::LogCapture capture;
     bound.feed(buildUtranCellMonitorRecord({servingUtranCell()}), kCellMonitor);
     EXPECT_EQ(testing::keysOf(*bound.section),
@@ -173,7 +173,7 @@ TEST(UtranServingCell, CellMonitorUarfcnGoesUnderBothKeys) {
 }
 
 TEST(UtranServingCell, TheLastServingUtranCellWins) {
-    BoundKeySection<UTRANServingCellInfo> bound;
+    KeySectionHarness<UTRANServingCellInfo> bound;
     UtranCellMonitorCell second = servingUtranCell();
     second.cellId = 2;
     second.uarfcn = 9800;
@@ -196,7 +196,7 @@ TEST(UtranServingCell, TheLastServingUtranCellWins) {
 }
 
 TEST(UtranServingCell, EveryMissingNumberHasItsMessage) {
-    BoundKeySection<UTRANServingCellInfo> bound;
+    KeySectionHarness<UTRANServingCellInfo> bound;
     UtranCellMonitorCell cell;
     cell.technology = std::string(kKxCellMonitorRadioAccessTechnologyUTRAN2);
     cell.cellType = std::string(kKxCellMonitorCellTypeServing);
@@ -212,7 +212,7 @@ TEST(UtranServingCell, EveryMissingNumberHasItsMessage) {
 }
 
 TEST(UtranServingCell, UnreadableArrayIsLoggedOnceAndEmptyArrayIsSilent) {
-    BoundKeySection<UTRANServingCellInfo> bound;
+    KeySectionHarness<UTRANServingCellInfo> bound;
     {
         testing::LogCapture capture;
         bound.feed(packetWithPayload(0x0001, {'<', 'x'}), kCellMonitor);
