@@ -50,6 +50,12 @@ struct ServingCellWalk {
 // Copies the fields of the serving cell(s) that the walk picks into section.
 void showServingCell(ByteView record, const ServingCellWalk& walk, PlistDictionary* section);
 
+// The serving-cell walk as the writer of a decoder's cell-monitor rule (RecordRule::write).
+template <const ServingCellWalk& walk>
+void writeServingCell(ByteView record, const PlistDictionaryRef& section) {
+    showServingCell(record, walk, section.get());
+}
+
 // Empties section (whether or not the record parses) and, when it parses, replaces its content with one row
 // per neighbour cell of the technology, in array order. A row is added even when all of its fields failed.
 void showNeighbourCells(ByteView record, std::string_view technology,

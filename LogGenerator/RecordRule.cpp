@@ -23,8 +23,10 @@ const RecordRule* admitRecord(const DecoderRules& decoder, ByteView record, std:
     return nullptr;
 }
 
-void writeRuleFields(const RecordRule& rule, ByteView record, PlistDictionary* section) {
-    if (section != nullptr) {
+void writeRecord(const RecordRule& rule, ByteView record, const PlistDictionaryRef& section) {
+    if (rule.write != nullptr) {
+        rule.write(record, section);
+    } else if (section) {
         writeFields(rule.fields, RecordReader(record), 0, *section);
     }
 }

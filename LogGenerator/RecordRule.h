@@ -1,8 +1,9 @@
 // RecordRule: the checks that every record decoder makes before it decodes anything, declared as a table.
 //
 // Contract: a decoder declares its DecoderRules: the title it logs on every call, one RecordRule per log code
-// it handles (the code, the minimum record length, and, for records that are flat lists of fields, the field
-// table written into its key section) and what it does with any other code. admitRecord logs the title
+// it handles (the code, the minimum record length, and what the record shows in a key section: the table of
+// its fields when it is a flat list of fields, else the function that writes it) and what it does with any
+// other code. admitRecord logs the title
 // (warning priority unless the rules name another); answers null for a code without a rule, after logging
 // "Received an unknown log message: %d" (error priority) unless the decoder ignores other codes; answers
 // null, silently, for a record shorter than the rule's minimum, which then changes nothing; otherwise answers
@@ -22,13 +23,18 @@
 
 namespace velmar {
 
+// Writes what an admitted record shows into a key section; the section is null when the decoder is unbound.
+using RecordWriter = void (*)(ByteView record, const PlistDictionaryRef& section);
+
 // One log code that a decoder handles.
 struct RecordRule {
     std::int32_t code;
     // Records shorter than this are dropped without a message; 0 admits any length (extra records).
     std::size_t minimumLength;
-    // Fields written, in order, into the key section; empty when the decoder reads the record itself.
+    // Fields written, in order, into the key section, for a record that is a flat list of fields.
     std::span<const RecordField> fields = {};
+    // Writes the record instead of the fields, for a record that is not.
+    RecordWriter write = nullptr;
 };
 
 struct DecoderRules {
@@ -45,8 +51,9 @@ void logDecoderTitle(const char* title, int priority = kLogWarning);
 void reportUnknownLogMessage(std::int32_t logCode);
 // The common preamble described above: the rule of the record, or null when it is not to be decoded.
 const RecordRule* admitRecord(const DecoderRules& decoder, ByteView record, std::int32_t logCode);
-// Writes the rule's fields into section, when there is one.
-void writeRuleFields(const RecordRule& rule, ByteView record, PlistDictionary* section);
+// Writes an admitted record into a key section by its rule: through the rule's writer when it has one, else
+// the rule's fields (when there is a section).
+void writeRecord(const RecordRule& rule, ByteView record, const PlistDictionaryRef& section);
 
 // Whether the rules handle exactly the codes of row, in the same order.
 constexpr bool rulesMatch(std::span<const RecordRule> rules, const DecoderRow& row) {

@@ -9,11 +9,6 @@ namespace velmar {
 
 namespace {
 
-constexpr RecordRule kRules[] = {
-    {kLogCodeUmtsBlockErrors, 16},
-};
-constexpr DecoderRules kDecoderRules{"BLER", kRules};
-
 constexpr RecordField kWindowFields[] = {
     u16Field(14, "Window Size"),
 };
@@ -29,18 +24,9 @@ constexpr std::size_t kChannelCountOffset = 13;
 constexpr std::size_t kFirstEntryOffset = 16;
 constexpr std::size_t kEntryLength = 9;
 
-}  // namespace
-
-BLER::BLER() : TableDecoder(rowOf<BLER>(kGsmDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<BLER>(kGsmDecoders)));
-
-void BLER::updateWithData(ByteView data, std::int32_t logCode) {
-    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
-        return;
-    }
+void writeBlockErrors(ByteView data, const PlistDictionaryRef& section) {
     const RecordReader record(data);
     const CountedList channels{kFirstEntryOffset, kEntryLength, record.u8(kChannelCountOffset)};
-    const PlistDictionaryRef section = sectionDictionary();
     if (!section) {
         return;
     }
@@ -53,5 +39,15 @@ void BLER::updateWithData(ByteView data, std::int32_t logCode) {
     }
     section->set("Transport Channels", std::move(rows));
 }
+
+constexpr RecordRule kRules[] = {
+    {kLogCodeUmtsBlockErrors, 16, {}, &writeBlockErrors},
+};
+constexpr DecoderRules kDecoderRules{"BLER", kRules};
+
+}  // namespace
+
+BLER::BLER() : KeySectionDecoder(rowOf<BLER>(kGsmDecoders), kDecoderRules) {}
+static_assert(rulesMatch(kRules, rowOf<BLER>(kGsmDecoders)));
 
 }  // namespace velmar

@@ -6,14 +6,13 @@
 // entries past the end read as zeros.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class BLER : public TableDecoder {
+class BLER : public KeySectionDecoder {
   public:
     BLER();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -100,13 +100,7 @@ constexpr DecoderRules kDecoderRules{"GPRSInformation", kRules};
 
 }  // namespace
 
-GPRSInformation::GPRSInformation() : TableDecoder(rowOf<GPRSInformation>(kGsmDecoders)) {}
+GPRSInformation::GPRSInformation() : KeySectionDecoder(rowOf<GPRSInformation>(kGsmDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<GPRSInformation>(kGsmDecoders)));
-
-void GPRSInformation::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

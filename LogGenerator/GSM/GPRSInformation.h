@@ -7,14 +7,13 @@
 // nothing.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class GPRSInformation : public TableDecoder {
+class GPRSInformation : public KeySectionDecoder {
   public:
     GPRSInformation();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

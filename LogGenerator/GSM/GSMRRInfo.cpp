@@ -77,13 +77,7 @@ constexpr DecoderRules kDecoderRules{"GSMRRInfo", kRules};
 
 }  // namespace
 
-GSMRRInfo::GSMRRInfo() : TableDecoder(rowOf<GSMRRInfo>(kGsmDecoders)) {}
+GSMRRInfo::GSMRRInfo() : KeySectionDecoder(rowOf<GSMRRInfo>(kGsmDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<GSMRRInfo>(kGsmDecoders)));
-
-void GSMRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

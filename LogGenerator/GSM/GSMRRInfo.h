@@ -5,14 +5,13 @@
 // message: %d"; records shorter than their code's minimum change nothing.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class GSMRRInfo : public TableDecoder {
+class GSMRRInfo : public KeySectionDecoder {
   public:
     GSMRRInfo();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

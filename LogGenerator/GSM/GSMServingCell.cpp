@@ -29,14 +29,6 @@ constexpr RecordField kDedicatedChannelFields[] = {
     bitField(13, 2, 0, 7, "MA Dedicated ARFCN"),
 };
 
-constexpr RecordRule kRules[] = {
-    {kLogCodeGsmServingIdentity, 26, kIdentityFields},
-    {kLogCodeGsmMeasurements, 29, kMeasurementFields},
-    {kLogCodeGsmDedicatedChannel, 17, kDedicatedChannelFields},
-    {kLogCodeCellMonitor, 0},
-};
-constexpr DecoderRules kDecoderRules{"GSMServingCell", kRules};
-
 constexpr CellMonitorField kCellMonitorFields[] = {
     {kKxCellMonitorCellId, "Cell ID", "GSMServingCell: Failed to retrieve Cell ID\n"},
     {kKxCellMonitorARFCN, "ARFCN", "GSMServingCell: Failed to retrieve ARFCN\n"},
@@ -44,22 +36,17 @@ constexpr CellMonitorField kCellMonitorFields[] = {
 constexpr std::string_view kGsm[] = {kKxCellMonitorRadioAccessTechnologyGSM};
 constexpr ServingCellWalk kServingCellWalk{kGsm, kCellMonitorFields};
 
+constexpr RecordRule kRules[] = {
+    {kLogCodeGsmServingIdentity, 26, kIdentityFields},
+    {kLogCodeGsmMeasurements, 29, kMeasurementFields},
+    {kLogCodeGsmDedicatedChannel, 17, kDedicatedChannelFields},
+    {kLogCodeCellMonitor, 0, {}, &writeServingCell<kServingCellWalk>},
+};
+constexpr DecoderRules kDecoderRules{"GSMServingCell", kRules};
+
 }  // namespace
 
-GSMServingCell::GSMServingCell() : TableDecoder(rowOf<GSMServingCell>(kGsmDecoders)) {}
+GSMServingCell::GSMServingCell() : KeySectionDecoder(rowOf<GSMServingCell>(kGsmDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<GSMServingCell>(kGsmDecoders)));
-
-void GSMServingCell::updateWithData(ByteView data, std::int32_t logCode) {
-    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
-    if (rule == nullptr) {
-        return;
-    }
-    const PlistDictionaryRef section = sectionDictionary();
-    if (rule->code == kLogCodeCellMonitor) {
-        showServingCell(data, kServingCellWalk, section.get());
-    } else {
-        writeRuleFields(*rule, data, section.get());
-    }
-}
 
 }  // namespace velmar

@@ -2,14 +2,13 @@
 // channel's ARFCN (0x5076) and the GSM serving cell of the cell-monitor record (0xFF0001).
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class GSMServingCell : public TableDecoder {
+class GSMServingCell : public KeySectionDecoder {
   public:
     GSMServingCell();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -9,12 +9,6 @@ namespace velmar {
 
 namespace {
 
-constexpr RecordRule kRules[] = {
-    {kLogCodeUmtsHsdpa, 18},
-};
-// Unlike most decoders, an unexpected code is ignored without a message.
-constexpr DecoderRules kDecoderRules{"HSDPA Info", kRules, DecoderRules::OtherCodes::Ignored};
-
 constexpr ValueName kCarrierRows[] = {
     {0, 0, "Single Carrier"},
     {1, 1, "MIMO"},
@@ -55,22 +49,13 @@ PlistArrayRef harqProcessRows(const RecordReader& record, const CountedList& lis
     return rows;
 }
 
-}  // namespace
-
-HSDPAInformation::HSDPAInformation() : TableDecoder(rowOf<HSDPAInformation>(kGsmDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<HSDPAInformation>(kGsmDecoders)));
-
-void HSDPAInformation::updateWithData(ByteView data, std::int32_t logCode) {
-    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
-        return;
-    }
+void writeHsdpa(ByteView data, const PlistDictionaryRef& section) {
     const RecordReader record(data);
     const std::size_t primaryCount = record.u8(kPrimaryCountOffset);
     const std::size_t secondaryCount = record.u8(kSecondaryCountOffset);
     const CountedList primary{kFirstEntryOffset, kEntryLength, primaryCount};
     const CountedList secondary{kFirstEntryOffset + kSecondaryListStridePerPrimaryEntry * primaryCount,
                                 kEntryLength, secondaryCount};
-    const PlistDictionaryRef section = sectionDictionary();
     if (!section) {
         return;
     }
@@ -83,5 +68,17 @@ void HSDPAInformation::updateWithData(ByteView data, std::int32_t logCode) {
         section->set("Secondary HARQ Process", harqProcessRows(record, secondary));
     }
 }
+
+constexpr RecordRule kRules[] = {
+    {kLogCodeUmtsHsdpa, 18, {}, &writeHsdpa},
+};
+// Unlike most decoders, an unexpected code is ignored without a message.
+constexpr DecoderRules kDecoderRules{"HSDPA Info", kRules, DecoderRules::OtherCodes::Ignored};
+
+}  // namespace
+
+HSDPAInformation::HSDPAInformation()
+    : KeySectionDecoder(rowOf<HSDPAInformation>(kGsmDecoders), kDecoderRules) {}
+static_assert(rulesMatch(kRules, rowOf<HSDPAInformation>(kGsmDecoders)));
 
 }  // namespace velmar

@@ -6,14 +6,13 @@
 // checked against the record's length: entries past the end read as zeros.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class HSDPAInformation : public TableDecoder {
+class HSDPAInformation : public KeySectionDecoder {
   public:
     HSDPAInformation();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -10,11 +10,6 @@ namespace velmar {
 
 namespace {
 
-constexpr RecordRule kRules[] = {
-    {kLogCodeGsmMobileAllocation, 15},
-};
-constexpr DecoderRules kDecoderRules{"MobileAllocation", kRules};
-
 constexpr RecordField kAllocationFields[] = {
     u8Field(13, "HSN"),
 };
@@ -25,15 +20,7 @@ constexpr std::size_t kArfcnListOffset = 15;
 constexpr std::size_t kArfcnSize = 2;
 constexpr RecordField kArfcn = u16Field(0, "ARFCN");
 
-}  // namespace
-
-MobileAllocation::MobileAllocation() : TableDecoder(rowOf<MobileAllocation>(kGsmDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<MobileAllocation>(kGsmDecoders)));
-
-void MobileAllocation::updateWithData(ByteView data, std::int32_t logCode) {
-    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
-        return;
-    }
+void writeMobileAllocation(ByteView data, const PlistDictionaryRef& section) {
     const RecordReader record(data);
     const CountedList list{kArfcnListOffset, kArfcnSize, record.u8(kArfcnCountOffset)};
     auto arfcns = PlistArray::create();
@@ -41,10 +28,21 @@ void MobileAllocation::updateWithData(ByteView data, std::int32_t logCode) {
     for (std::size_t i = 0; i < list.count; ++i) {
         arfcns->append(kArfcn.format.render(kArfcn.read(record, list.elementOffset(i))));
     }
-    if (const PlistDictionaryRef section = sectionDictionary()) {
+    if (section) {
         writeFields(kAllocationFields, record, 0, *section);
         section->set("ARFCNs", std::move(arfcns));
     }
 }
+
+constexpr RecordRule kRules[] = {
+    {kLogCodeGsmMobileAllocation, 15, {}, &writeMobileAllocation},
+};
+constexpr DecoderRules kDecoderRules{"MobileAllocation", kRules};
+
+}  // namespace
+
+MobileAllocation::MobileAllocation()
+    : KeySectionDecoder(rowOf<MobileAllocation>(kGsmDecoders), kDecoderRules) {}
+static_assert(rulesMatch(kRules, rowOf<MobileAllocation>(kGsmDecoders)));
 
 }  // namespace velmar

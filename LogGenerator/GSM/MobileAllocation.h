@@ -5,14 +5,13 @@
 // without the array lock, as key sections are.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class MobileAllocation : public TableDecoder {
+class MobileAllocation : public KeySectionDecoder {
   public:
     MobileAllocation();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

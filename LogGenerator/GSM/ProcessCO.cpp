@@ -23,13 +23,7 @@ constexpr DecoderRules kDecoderRules{"ProcessCS", kRules};
 
 }  // namespace
 
-ProcessCO::ProcessCO() : TableDecoder(rowOf<ProcessCO>(kGsmDecoders)) {}
+ProcessCO::ProcessCO() : KeySectionDecoder(rowOf<ProcessCO>(kGsmDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<ProcessCO>(kGsmDecoders)));
-
-void ProcessCO::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

@@ -5,14 +5,13 @@
 // purpose); other codes log "Received an unknown log message: %d"; records under 16 bytes change nothing.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class ProcessCO : public TableDecoder {
+class ProcessCO : public KeySectionDecoder {
   public:
     ProcessCO();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

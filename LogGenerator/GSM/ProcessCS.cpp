@@ -24,13 +24,7 @@ constexpr DecoderRules kDecoderRules{"ProcessCS", kRules};
 
 }  // namespace
 
-ProcessCS::ProcessCS() : TableDecoder(rowOf<ProcessCS>(kGsmDecoders)) {}
+ProcessCS::ProcessCS() : KeySectionDecoder(rowOf<ProcessCS>(kGsmDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<ProcessCS>(kGsmDecoders)));
-
-void ProcessCS::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

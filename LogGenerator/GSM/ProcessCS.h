@@ -5,14 +5,13 @@
 // message: %d"; records under 16 bytes change nothing.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class ProcessCS : public TableDecoder {
+class ProcessCS : public KeySectionDecoder {
   public:
     ProcessCS();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -24,13 +24,7 @@ constexpr DecoderRules kDecoderRules{"ProcessPS", kRules};
 
 }  // namespace
 
-ProcessPS::ProcessPS() : TableDecoder(rowOf<ProcessPS>(kGsmDecoders)) {}
+ProcessPS::ProcessPS() : KeySectionDecoder(rowOf<ProcessPS>(kGsmDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<ProcessPS>(kGsmDecoders)));
-
-void ProcessPS::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

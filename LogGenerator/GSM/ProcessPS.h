@@ -6,14 +6,13 @@
 // beyond them).
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class ProcessPS : public TableDecoder {
+class ProcessPS : public KeySectionDecoder {
   public:
     ProcessPS();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -35,19 +35,12 @@ constexpr RecordField kSelectionModeFields[] = {
     u8Field(14, "PLMN Sel Mod", asName(kSelectionModeNames)),
 };
 
-constexpr RecordRule kRules[] = {
-    {kLogCodeRegistrationInfo, 32},
-    {kLogCodeRegistrationState, 16, kSelectionModeFields},
-    {kLogCodeCellMonitor, 0},
-};
-constexpr DecoderRules kDecoderRules{"Serving PLMN", kRules};
-
 // A BCD digit as a character: 0..9 as the digit, 10..15 (the filler 0xF among them) as a blank.
 char bcdDigit(std::uint32_t nibble) {
     return nibble < 10 ? static_cast<char>('0' + nibble) : ' ';
 }
 
-void writeRegistration(ByteView data, PlistDictionary* section) {
+void writeRegistration(ByteView data, const PlistDictionaryRef& section) {
     if (section == nullptr) {
         return;
     }
@@ -74,28 +67,16 @@ constexpr std::string_view kUmtsOrGsm[] = {kKxCellMonitorRadioAccessTechnologyUM
                                            kKxCellMonitorRadioAccessTechnologyGSM};
 constexpr ServingCellWalk kServingCellWalk{kUmtsOrGsm, kCellMonitorFields};
 
+constexpr RecordRule kRules[] = {
+    {kLogCodeRegistrationInfo, 32, {}, &writeRegistration},
+    {kLogCodeRegistrationState, 16, kSelectionModeFields},
+    {kLogCodeCellMonitor, 0, {}, &writeServingCell<kServingCellWalk>},
+};
+constexpr DecoderRules kDecoderRules{"Serving PLMN", kRules};
+
 }  // namespace
 
-ServingPLMN::ServingPLMN() : TableDecoder(rowOf<ServingPLMN>(kGsmDecoders)) {}
+ServingPLMN::ServingPLMN() : KeySectionDecoder(rowOf<ServingPLMN>(kGsmDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<ServingPLMN>(kGsmDecoders)));
-
-void ServingPLMN::updateWithData(ByteView data, std::int32_t logCode) {
-    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
-    if (rule == nullptr) {
-        return;
-    }
-    const PlistDictionaryRef section = sectionDictionary();
-    switch (rule->code) {
-        case kLogCodeRegistrationInfo:
-            writeRegistration(data, section.get());
-            break;
-        case kLogCodeCellMonitor:
-            showServingCell(data, kServingCellWalk, section.get());
-            break;
-        default:
-            writeRuleFields(*rule, data, section.get());
-            break;
-    }
-}
 
 }  // namespace velmar

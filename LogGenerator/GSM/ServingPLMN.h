@@ -7,14 +7,13 @@
 // write keeps its earlier value.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class ServingPLMN : public TableDecoder {
+class ServingPLMN : public KeySectionDecoder {
   public:
     ServingPLMN();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -29,23 +29,9 @@ constexpr SimFileKey kSimFiles[] = {
     {"kSimFile_OPLMNAcT", "EF-OPLMNAcT"},
 };
 
-constexpr RecordRule kRules[] = {
-    {kLogCodeSimFiles, 0},
-};
-constexpr DecoderRules kDecoderRules{"SimInfo", kRules, DecoderRules::OtherCodes::Ignored};
-
-}  // namespace
-
-SimInfo::SimInfo() : TableDecoder(kSimInfoRow) {}
-static_assert(rulesMatch(kRules, kSimInfoRow));
-
-void SimInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
-        return;
-    }
+void writeSimFiles(ByteView data, const PlistDictionaryRef& section) {
     // Throws, before any key changes, when the record cannot be parsed.
     const LogCode_0xFF0000::SimFileDictionary simFiles(data);
-    const PlistDictionaryRef section = sectionDictionary();
     if (!section) {
         return;
     }
@@ -55,5 +41,15 @@ void SimInfo::updateWithData(ByteView data, std::int32_t logCode) {
         }
     }
 }
+
+constexpr RecordRule kRules[] = {
+    {kLogCodeSimFiles, 0, {}, &writeSimFiles},
+};
+constexpr DecoderRules kDecoderRules{"SimInfo", kRules, DecoderRules::OtherCodes::Ignored};
+
+}  // namespace
+
+SimInfo::SimInfo() : KeySectionDecoder(kSimInfoRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kSimInfoRow));
 
 }  // namespace velmar

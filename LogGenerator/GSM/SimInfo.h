@@ -7,15 +7,14 @@
 // Other codes are ignored without a message.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 #include "core/platform/logcodes/ExtraLogCodes.h"
 
 namespace velmar {
 
-class SimInfo : public TableDecoder {
+class SimInfo : public KeySectionDecoder {
   public:
     SimInfo();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 // The row of every technology's decoder table.

@@ -38,18 +38,9 @@ constexpr RecordField kCipheringFields[] = {
     u8Field(13, "Ciphering", asName(kCipheringNames)),
 };
 
-constexpr RecordRule kRules[] = {
-    {kLogCodeUmtsRrcState, 14, kRrcStateFields},
-    {kLogCodeUmtsTransmitPower, 16},
-    {kLogCodeUmtsCellIdentity, 29},
-    {kLogCodeUmtsCiphering, 19, kCipheringFields},
-    {kLogCodeCellMonitor, 0},
-};
-constexpr DecoderRules kDecoderRules{"UMTSRRInfo", kRules};
-
 // 0x4031: the mean of the non-zero uplink power readings. With no such reading the mean is 0 / 0 and shows
 // as not-a-number; the display has always shown it so.
-void writeTransmitPower(ByteView data, PlistDictionary* section) {
+void writeTransmitPower(ByteView data, const PlistDictionaryRef& section) {
     constexpr std::size_t kCountOffset = 14;
     constexpr std::size_t kFirstEntryOffset = 16;
     constexpr std::size_t kEntryLength = 14;
@@ -70,7 +61,7 @@ void writeTransmitPower(ByteView data, PlistDictionary* section) {
     }
 }
 
-void writeCellIdentity(ByteView data, PlistDictionary* section) {
+void writeCellIdentity(ByteView data, const PlistDictionaryRef& section) {
     if (section == nullptr) {
         return;
     }
@@ -89,31 +80,18 @@ constexpr CellMonitorField kCellMonitorFields[] = {
 constexpr std::string_view kUmts[] = {kKxCellMonitorRadioAccessTechnologyUMTS};
 constexpr ServingCellWalk kServingCellWalk{kUmts, kCellMonitorFields};
 
+constexpr RecordRule kRules[] = {
+    {kLogCodeUmtsRrcState, 14, kRrcStateFields},
+    {kLogCodeUmtsTransmitPower, 16, {}, &writeTransmitPower},
+    {kLogCodeUmtsCellIdentity, 29, {}, &writeCellIdentity},
+    {kLogCodeUmtsCiphering, 19, kCipheringFields},
+    {kLogCodeCellMonitor, 0, {}, &writeServingCell<kServingCellWalk>},
+};
+constexpr DecoderRules kDecoderRules{"UMTSRRInfo", kRules};
+
 }  // namespace
 
-UMTSRRInfo::UMTSRRInfo() : TableDecoder(rowOf<UMTSRRInfo>(kGsmDecoders)) {}
+UMTSRRInfo::UMTSRRInfo() : KeySectionDecoder(rowOf<UMTSRRInfo>(kGsmDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<UMTSRRInfo>(kGsmDecoders)));
-
-void UMTSRRInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
-    if (rule == nullptr) {
-        return;
-    }
-    const PlistDictionaryRef section = sectionDictionary();
-    switch (rule->code) {
-        case kLogCodeUmtsTransmitPower:
-            writeTransmitPower(data, section.get());
-            break;
-        case kLogCodeUmtsCellIdentity:
-            writeCellIdentity(data, section.get());
-            break;
-        case kLogCodeCellMonitor:
-            showServingCell(data, kServingCellWalk, section.get());
-            break;
-        default:
-            writeRuleFields(*rule, data, section.get());
-            break;
-    }
-}
 
 }  // namespace velmar

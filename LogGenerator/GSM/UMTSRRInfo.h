@@ -7,14 +7,13 @@
 // the cell-monitor array wrote; the next cell-monitor record writes it again.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class UMTSRRInfo : public TableDecoder {
+class UMTSRRInfo : public KeySectionDecoder {
   public:
     UMTSRRInfo();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -26,13 +26,7 @@ constexpr DecoderRules kDecoderRules{"Connected mode LTE Intra-frequency Measure
 }  // namespace
 
 ConnectedModeMeasurementMisc::ConnectedModeMeasurementMisc()
-    : TableDecoder(rowOf<ConnectedModeMeasurementMisc>(kLteDecoders)) {}
+    : KeySectionDecoder(rowOf<ConnectedModeMeasurementMisc>(kLteDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<ConnectedModeMeasurementMisc>(kLteDecoders)));
-
-void ConnectedModeMeasurementMisc::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

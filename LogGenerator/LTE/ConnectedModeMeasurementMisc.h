@@ -4,14 +4,13 @@
 // Contract: a record under 29 bytes changes nothing; another code is reported as unknown.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class ConnectedModeMeasurementMisc : public TableDecoder {
+class ConnectedModeMeasurementMisc : public KeySectionDecoder {
   public:
     ConnectedModeMeasurementMisc();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -19,7 +19,6 @@ constexpr ValueName kBandwidthRows[] = {
 };
 constexpr ValueNames kBandwidthNames{kBandwidthRows, "Unknown"};
 
-// 0xB0C2 is written in two runs: "UARFCN" is removed between them.
 constexpr RecordField kServingCellChannels[] = {
     u16Field(14, "Physical Cell ID"),
     u16Field(16, "Download Frequency"),
@@ -48,45 +47,35 @@ constexpr CellMonitorField kCellMonitorFields[] = {
 constexpr std::string_view kLte[] = {kKxCellMonitorRadioAccessTechnologyLTE};
 constexpr ServingCellWalk kServingCellWalk{kLte, kCellMonitorFields};
 
+// 0xB0C2 is written in two runs, with "UARFCN" removed between them.
+void writeServingCellInfo(ByteView data, const PlistDictionaryRef& section) {
+    if (section) {
+        const RecordReader record(data);
+        writeFields(kServingCellChannels, record, 0, *section);
+        section->remove(kUarfcnKey);
+        writeFields(kServingCellIdentity, record, 0, *section);
+    }
+}
+
+// Every good 0xB0C1 record is also reported as unknown; the line is part of the record's handling.
+void writeMasterInformation(ByteView data, const PlistDictionaryRef& section) {
+    if (section) {
+        writeFields(kMasterInformation, RecordReader(data), 0, *section);
+    }
+    reportUnknownLogMessage(kLogCodeLteMasterInformation);
+}
+
 constexpr RecordRule kRules[] = {
-    {kLogCodeLteServingCellInfo, 38},
-    {kLogCodeLteMasterInformation, 22, kMasterInformation},
-    {kLogCodeCellMonitor, 0},
+    {kLogCodeLteServingCellInfo, 38, {}, &writeServingCellInfo},
+    {kLogCodeLteMasterInformation, 22, {}, &writeMasterInformation},
+    {kLogCodeCellMonitor, 0, {}, &writeServingCell<kServingCellWalk>},
 };
 constexpr DecoderRules kDecoderRules{"LTE Serving Cell Info", kRules};
 
 }  // namespace
 
-LTEServingCellInfo::LTEServingCellInfo() : TableDecoder(rowOf<LTEServingCellInfo>(kLteDecoders)) {}
+LTEServingCellInfo::LTEServingCellInfo()
+    : KeySectionDecoder(rowOf<LTEServingCellInfo>(kLteDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<LTEServingCellInfo>(kLteDecoders)));
-
-void LTEServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
-    if (rule == nullptr) {
-        return;
-    }
-    const PlistDictionaryRef section = sectionDictionary();
-    switch (rule->code) {
-        case kLogCodeLteServingCellInfo: {
-            if (section) {
-                const RecordReader record(data);
-                writeFields(kServingCellChannels, record, 0, *section);
-                section->remove(kUarfcnKey);
-                writeFields(kServingCellIdentity, record, 0, *section);
-            }
-            return;
-        }
-        case kLogCodeLteMasterInformation: {
-            writeRuleFields(*rule, data, section.get());
-            // Every good 0xB0C1 record is also reported as unknown; the line is part of the record's
-            // handling.
-            reportUnknownLogMessage(logCode);
-            return;
-        }
-        default:
-            showServingCell(data, kServingCellWalk, section.get());
-            return;
-    }
-}
 
 }  // namespace velmar

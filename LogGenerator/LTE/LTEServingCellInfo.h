@@ -8,14 +8,13 @@
 // searched for the first serving LTE cell; its missing numbers are logged and leave their keys as they were.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class LTEServingCellInfo : public TableDecoder {
+class LTEServingCellInfo : public KeySectionDecoder {
   public:
     LTEServingCellInfo();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

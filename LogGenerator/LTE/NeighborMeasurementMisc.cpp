@@ -24,13 +24,7 @@ constexpr DecoderRules kDecoderRules{"Neighbor Measurements", kRules};
 }  // namespace
 
 NeighborMeasurementMisc::NeighborMeasurementMisc()
-    : TableDecoder(rowOf<NeighborMeasurementMisc>(kLteDecoders)) {}
+    : KeySectionDecoder(rowOf<NeighborMeasurementMisc>(kLteDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<NeighborMeasurementMisc>(kLteDecoders)));
-
-void NeighborMeasurementMisc::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

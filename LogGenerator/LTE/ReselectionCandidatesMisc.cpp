@@ -24,13 +24,7 @@ constexpr DecoderRules kDecoderRules{"Reselection Candidates", kRules};
 }  // namespace
 
 ReselectionCandidatesMisc::ReselectionCandidatesMisc()
-    : TableDecoder(rowOf<ReselectionCandidatesMisc>(kLteDecoders)) {}
+    : KeySectionDecoder(rowOf<ReselectionCandidatesMisc>(kLteDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<ReselectionCandidatesMisc>(kLteDecoders)));
-
-void ReselectionCandidatesMisc::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

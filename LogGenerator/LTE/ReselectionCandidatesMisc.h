@@ -4,14 +4,13 @@
 // Contract: a record under 21 bytes changes nothing; another code is reported as unknown.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class ReselectionCandidatesMisc : public TableDecoder {
+class ReselectionCandidatesMisc : public KeySectionDecoder {
   public:
     ReselectionCandidatesMisc();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -45,13 +45,7 @@ constexpr DecoderRules kDecoderRules{"Serving Cell Measurements", kRules};
 }  // namespace
 
 ServingCellMeasurement::ServingCellMeasurement()
-    : TableDecoder(rowOf<ServingCellMeasurement>(kLteDecoders)) {}
+    : KeySectionDecoder(rowOf<ServingCellMeasurement>(kLteDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<ServingCellMeasurement>(kLteDecoders)));
-
-void ServingCellMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
-    if (const RecordRule* rule = admitRecord(kDecoderRules, data, logCode)) {
-        writeRuleFields(*rule, data, sectionDictionary().get());
-    }
-}
 
 }  // namespace velmar

@@ -6,14 +6,13 @@
 // so it never shows it.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class ServingCellMeasurement : public TableDecoder {
+class ServingCellMeasurement : public KeySectionDecoder {
   public:
     ServingCellMeasurement();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

@@ -13,9 +13,6 @@ namespace velmar {
 namespace {
 
 constexpr std::size_t kExpectedLength = 15;
-// The length is only reported, never enforced.
-constexpr RecordRule kRules[] = {{kLogCodeUtranRrcState, 0}};
-constexpr DecoderRules kDecoderRules{"RRC Info", kRules, DecoderRules::OtherCodes::Ignored};
 
 constexpr std::size_t kModeValidOffset = 13;
 constexpr std::size_t kModeOffset = 14;
@@ -27,15 +24,7 @@ constexpr ValueName kStateRows[] = {
 };
 constexpr ValueNames kStateNames{kStateRows, "Unknown RRC Mode"};
 
-}  // namespace
-
-RRC_State::RRC_State() : TableDecoder(rowOf<RRC_State>(kUtranDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<RRC_State>(kUtranDecoders)));
-
-void RRC_State::updateWithData(ByteView data, std::int32_t logCode) {
-    if (admitRecord(kDecoderRules, data, logCode) == nullptr) {
-        return;
-    }
+void writeRrcState(ByteView data, const PlistDictionaryRef& section) {
     if (data.size() < kExpectedLength) {
         SystemLog::log(kLogWarning, "LogCode_0xD0E0 is length is %ld expected size %ld",
                        static_cast<long>(data.size()), static_cast<long>(kExpectedLength));
@@ -43,7 +32,6 @@ void RRC_State::updateWithData(ByteView data, std::int32_t logCode) {
     const RecordReader record(data);
     const std::uint32_t mode = record.u8(kModeValidOffset) == 1 ? record.u8(kModeOffset) : kUnknownMode;
     const std::string state = kStateNames.nameOf(mode);
-    const PlistDictionaryRef section = sectionDictionary();
     if (section) {
         section->set("State", state);
     }
@@ -53,5 +41,14 @@ void RRC_State::updateWithData(ByteView data, std::int32_t logCode) {
                        static_cast<int>(mode), state.c_str());
     }
 }
+
+// The length is only reported, never enforced.
+constexpr RecordRule kRules[] = {{kLogCodeUtranRrcState, 0, {}, &writeRrcState}};
+constexpr DecoderRules kDecoderRules{"RRC Info", kRules, DecoderRules::OtherCodes::Ignored};
+
+}  // namespace
+
+RRC_State::RRC_State() : KeySectionDecoder(rowOf<RRC_State>(kUtranDecoders), kDecoderRules) {}
+static_assert(rulesMatch(kRules, rowOf<RRC_State>(kUtranDecoders)));
 
 }  // namespace velmar

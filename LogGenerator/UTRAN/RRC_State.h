@@ -6,14 +6,13 @@
 // when byte 13 is 1, otherwise 255 ("Unknown RRC Mode"). Other codes are ignored silently.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class RRC_State : public TableDecoder {
+class RRC_State : public KeySectionDecoder {
   public:
     RRC_State();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar

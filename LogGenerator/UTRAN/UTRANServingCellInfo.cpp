@@ -41,26 +41,14 @@ constexpr ServingCellWalk kServingCellWalk{kUtran, kCellMonitorFields, ServingCe
 
 constexpr RecordRule kRules[] = {
     {kLogCodeUtranServingCell, 26, kServingCellFields},
-    {kLogCodeCellMonitor, 0},
+    {kLogCodeCellMonitor, 0, {}, &writeServingCell<kServingCellWalk>},
 };
 constexpr DecoderRules kDecoderRules{"Serving Cell Info", kRules, DecoderRules::OtherCodes::Ignored};
 
 }  // namespace
 
-UTRANServingCellInfo::UTRANServingCellInfo() : TableDecoder(rowOf<UTRANServingCellInfo>(kUtranDecoders)) {}
+UTRANServingCellInfo::UTRANServingCellInfo()
+    : KeySectionDecoder(rowOf<UTRANServingCellInfo>(kUtranDecoders), kDecoderRules) {}
 static_assert(rulesMatch(kRules, rowOf<UTRANServingCellInfo>(kUtranDecoders)));
-
-void UTRANServingCellInfo::updateWithData(ByteView data, std::int32_t logCode) {
-    const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);
-    if (rule == nullptr) {
-        return;
-    }
-    const PlistDictionaryRef section = sectionDictionary();
-    if (rule->code == kLogCodeUtranServingCell) {
-        writeRuleFields(*rule, data, section.get());
-        return;
-    }
-    showServingCell(data, kServingCellWalk, section.get());
-}
 
 }  // namespace velmar

@@ -7,14 +7,13 @@
 // their keys as they were. Other codes are ignored silently.
 #pragma once
 
-#include "LogGenerator/DecoderTable.h"
+#include "LogGenerator/KeySectionDecoder.h"
 
 namespace velmar {
 
-class UTRANServingCellInfo : public TableDecoder {
+class UTRANServingCellInfo : public KeySectionDecoder {
   public:
     UTRANServingCellInfo();
-    void updateWithData(ByteView data, std::int32_t logCode) override;
 };
 
 }  // namespace velmar
