@@ -4,7 +4,7 @@
 //
 // Contract: a class index creates its decoders from its table (ClassIndex(rows)); every decoder of a table
 // derives from TableDecoder and answers getSectionName and getLogCodeArray from its own row, which it finds
-// by its class (rowOf), so the table is the one place that says which decoder handles which code. A row
+// by its class name (rowOf), so the table is the one place that says which decoder handles which code. A row
 // without codes subscribes to nothing (its code array is null). Decoders that every technology shares keep
 // their row beside their class and the tables name that row.
 #pragma once
@@ -69,11 +69,11 @@ struct DecoderRow {
     ::velmar::DecoderRow{#Decoder, section, {__VA_ARGS__}, &::velmar::createDecoder<Decoder>}
 // clang-format on
 
-// The row of Decoder in table; a decoder missing from the table does not compile.
-template <typename Decoder, std::size_t N>
-consteval const DecoderRow& rowOf(const DecoderRow (&table)[N]) {
+// The row of the decoder class named `decoder` in table; a name missing from the table does not compile.
+template <std::size_t N>
+consteval const DecoderRow& rowOf(const DecoderRow (&table)[N], std::string_view decoder) {
     for (const DecoderRow& row : table) {
-        if (row.create == &createDecoder<Decoder>) {
+        if (decoder == row.decoder) {
             return row;
         }
     }

@@ -9,6 +9,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "BLER");
+
 constexpr RecordField kWindowFields[] = {
     u16Field(14, "Window Size"),
 };
@@ -47,7 +49,7 @@ constexpr DecoderRules kDecoderRules{"BLER", kRules};
 
 }  // namespace
 
-BLER::BLER() : KeySectionDecoder(rowOf<BLER>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<BLER>(kGsmDecoders)));
+BLER::BLER() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

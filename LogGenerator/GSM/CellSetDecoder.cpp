@@ -10,6 +10,11 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kActiveSetRow = rowOf(kGsmDecoders, "ActiveSet");
+constexpr const DecoderRow& kDetectedSetRow = rowOf(kGsmDecoders, "DetectedSet");
+constexpr const DecoderRow& kMonitoredSetRow = rowOf(kGsmDecoders, "MonitoredSet");
+constexpr const DecoderRow& kVirtualActiveSetRow = rowOf(kGsmDecoders, "VirtualActiveSet");
+
 constexpr RecordRule kRules[] = {
     {kLogCodeUmtsCellSets, CellSetRecord::kMinimumLength},
 };
@@ -56,13 +61,13 @@ void CellSetDecoder::updateWithData(ByteView data, std::int32_t logCode) {
     replaceArray(section, rows);
 }
 
-ActiveSet::ActiveSet() : CellSetDecoder(rowOf<ActiveSet>(kGsmDecoders), true) {}
-static_assert(rulesMatch(kRules, rowOf<ActiveSet>(kGsmDecoders)));
-DetectedSet::DetectedSet() : CellSetDecoder(rowOf<DetectedSet>(kGsmDecoders), false) {}
-static_assert(rulesMatch(kRules, rowOf<DetectedSet>(kGsmDecoders)));
-MonitoredSet::MonitoredSet() : CellSetDecoder(rowOf<MonitoredSet>(kGsmDecoders), false) {}
-static_assert(rulesMatch(kRules, rowOf<MonitoredSet>(kGsmDecoders)));
-VirtualActiveSet::VirtualActiveSet() : CellSetDecoder(rowOf<VirtualActiveSet>(kGsmDecoders), false) {}
-static_assert(rulesMatch(kRules, rowOf<VirtualActiveSet>(kGsmDecoders)));
+ActiveSet::ActiveSet() : CellSetDecoder(kActiveSetRow, true) {}
+static_assert(rulesMatch(kRules, kActiveSetRow));
+DetectedSet::DetectedSet() : CellSetDecoder(kDetectedSetRow, false) {}
+static_assert(rulesMatch(kRules, kDetectedSetRow));
+MonitoredSet::MonitoredSet() : CellSetDecoder(kMonitoredSetRow, false) {}
+static_assert(rulesMatch(kRules, kMonitoredSetRow));
+VirtualActiveSet::VirtualActiveSet() : CellSetDecoder(kVirtualActiveSetRow, false) {}
+static_assert(rulesMatch(kRules, kVirtualActiveSetRow));
 
 }  // namespace velmar

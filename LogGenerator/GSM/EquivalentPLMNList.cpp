@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "EquivalentPLMNList");
+
 constexpr RecordRule kRules[] = {
     {kLogCodeEquivalentPlmns, 17},
 };
@@ -44,8 +46,8 @@ PlistDictionaryRef plmnRow(const RecordReader& record, std::size_t at) {
 
 }  // namespace
 
-EquivalentPLMNList::EquivalentPLMNList() : TableDecoder(rowOf<EquivalentPLMNList>(kGsmDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<EquivalentPLMNList>(kGsmDecoders)));
+EquivalentPLMNList::EquivalentPLMNList() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void EquivalentPLMNList::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

@@ -8,6 +8,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "GPRSInformation");
+
 constexpr ValueName kNetworkOperatingModeRows[] = {{0, 0, "Class 1"}, {1, 1, "Class 2"}, {2, 2, "Class 3"}};
 constexpr ValueNames kNetworkOperatingModeNames{kNetworkOperatingModeRows, "Unknown"};
 
@@ -100,7 +102,7 @@ constexpr DecoderRules kDecoderRules{"GPRSInformation", kRules};
 
 }  // namespace
 
-GPRSInformation::GPRSInformation() : KeySectionDecoder(rowOf<GPRSInformation>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<GPRSInformation>(kGsmDecoders)));
+GPRSInformation::GPRSInformation() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -8,6 +8,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "GSMRRInfo");
+
 // Three of the names carry a blank inside, as the baseband spells them.
 constexpr ValueName kRrStateRows[] = {
     {0, 0, "RR_INACTIVE"},
@@ -77,7 +79,7 @@ constexpr DecoderRules kDecoderRules{"GSMRRInfo", kRules};
 
 }  // namespace
 
-GSMRRInfo::GSMRRInfo() : KeySectionDecoder(rowOf<GSMRRInfo>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<GSMRRInfo>(kGsmDecoders)));
+GSMRRInfo::GSMRRInfo() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -10,6 +10,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "GSMServingCell");
+
 constexpr RecordField kIdentityFields[] = {
     u16Field(17, "Cell ID"),
     u16Field(13, "ARFCN"),
@@ -46,7 +48,7 @@ constexpr DecoderRules kDecoderRules{"GSMServingCell", kRules};
 
 }  // namespace
 
-GSMServingCell::GSMServingCell() : KeySectionDecoder(rowOf<GSMServingCell>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<GSMServingCell>(kGsmDecoders)));
+GSMServingCell::GSMServingCell() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

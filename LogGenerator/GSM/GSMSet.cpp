@@ -9,6 +9,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "GSMSet");
+
 constexpr RecordRule kRules[] = {
     {kLogCodeUmtsIdleMeasurements, 15},
 };
@@ -25,8 +27,8 @@ constexpr RecordRowList kGsmCells{14, 15, 7, kGsmCellFields};
 
 }  // namespace
 
-GSMSet::GSMSet() : TableDecoder(rowOf<GSMSet>(kGsmDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<GSMSet>(kGsmDecoders)));
+GSMSet::GSMSet() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void GSMSet::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

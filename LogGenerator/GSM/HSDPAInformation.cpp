@@ -9,6 +9,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "HSDPAInformation");
+
 constexpr ValueName kCarrierRows[] = {
     {0, 0, "Single Carrier"},
     {1, 1, "MIMO"},
@@ -77,8 +79,7 @@ constexpr DecoderRules kDecoderRules{"HSDPA Info", kRules, DecoderRules::OtherCo
 
 }  // namespace
 
-HSDPAInformation::HSDPAInformation()
-    : KeySectionDecoder(rowOf<HSDPAInformation>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<HSDPAInformation>(kGsmDecoders)));
+HSDPAInformation::HSDPAInformation() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

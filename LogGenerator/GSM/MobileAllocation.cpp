@@ -10,6 +10,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "MobileAllocation");
+
 constexpr RecordField kAllocationFields[] = {
     u8Field(13, "HSN"),
 };
@@ -41,8 +43,7 @@ constexpr DecoderRules kDecoderRules{"MobileAllocation", kRules};
 
 }  // namespace
 
-MobileAllocation::MobileAllocation()
-    : KeySectionDecoder(rowOf<MobileAllocation>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<MobileAllocation>(kGsmDecoders)));
+MobileAllocation::MobileAllocation() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -13,6 +13,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "NeighboringCells");
+
 constexpr RecordRule kRules[] = {
     {kLogCodeGsmMeasurements, 29},
     {kLogCodeGsmBsicList, 15},
@@ -45,8 +47,8 @@ constexpr CellMonitorField kNeighbourCellFields[] = {
 
 }  // namespace
 
-NeighboringCells::NeighboringCells() : TableDecoder(rowOf<NeighboringCells>(kGsmDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<NeighboringCells>(kGsmDecoders)));
+NeighboringCells::NeighboringCells() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void NeighboringCells::updateWithData(ByteView data, std::int32_t logCode) {
     const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);

@@ -9,10 +9,10 @@ void PlaceholderDecoder::updateWithData(ByteView, std::int32_t) {
     logDecoderTitle(row().decoder);
 }
 
-CodingScheme::CodingScheme() : PlaceholderDecoder(rowOf<CodingScheme>(kGsmDecoders)) {}
-UMTSRRMeasurement::UMTSRRMeasurement() : PlaceholderDecoder(rowOf<UMTSRRMeasurement>(kGsmDecoders)) {}
-CellChangeCounters::CellChangeCounters() : PlaceholderDecoder(rowOf<CellChangeCounters>(kGsmDecoders)) {}
-NonRankedGSMSet::NonRankedGSMSet() : PlaceholderDecoder(rowOf<NonRankedGSMSet>(kGsmDecoders)) {}
-NonRankedUMTSSet::NonRankedUMTSSet() : PlaceholderDecoder(rowOf<NonRankedUMTSSet>(kGsmDecoders)) {}
+CodingScheme::CodingScheme() : PlaceholderDecoder(rowOf(kGsmDecoders, "CodingScheme")) {}
+UMTSRRMeasurement::UMTSRRMeasurement() : PlaceholderDecoder(rowOf(kGsmDecoders, "UMTSRRMeasurement")) {}
+CellChangeCounters::CellChangeCounters() : PlaceholderDecoder(rowOf(kGsmDecoders, "CellChangeCounters")) {}
+NonRankedGSMSet::NonRankedGSMSet() : PlaceholderDecoder(rowOf(kGsmDecoders, "NonRankedGSMSet")) {}
+NonRankedUMTSSet::NonRankedUMTSSet() : PlaceholderDecoder(rowOf(kGsmDecoders, "NonRankedUMTSSet")) {}
 
 }  // namespace velmar

@@ -9,6 +9,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "ProcessCO");
+
 // 0x7131: the common view shows the MM state only.
 constexpr RecordField kMmFields[] = {
     u8Field(13, "MM State", asName(kMmStateNames)),
@@ -23,7 +25,7 @@ constexpr DecoderRules kDecoderRules{"ProcessCS", kRules};
 
 }  // namespace
 
-ProcessCO::ProcessCO() : KeySectionDecoder(rowOf<ProcessCO>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<ProcessCO>(kGsmDecoders)));
+ProcessCO::ProcessCO() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -9,6 +9,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "ProcessCS");
+
 // 0x7131: MM state, sub-state and location-update status.
 constexpr RecordField kMmFields[] = {
     u8Field(13, "MM State", asName(kMmStateNames)),
@@ -24,7 +26,7 @@ constexpr DecoderRules kDecoderRules{"ProcessCS", kRules};
 
 }  // namespace
 
-ProcessCS::ProcessCS() : KeySectionDecoder(rowOf<ProcessCS>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<ProcessCS>(kGsmDecoders)));
+ProcessCS::ProcessCS() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -9,6 +9,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "ProcessPS");
+
 // 0x7130: GMM state, sub-state and update status.
 constexpr RecordField kGmmFields[] = {
     u8Field(13, "MM State", asName(kGmmStateNames)),
@@ -24,7 +26,7 @@ constexpr DecoderRules kDecoderRules{"ProcessPS", kRules};
 
 }  // namespace
 
-ProcessPS::ProcessPS() : KeySectionDecoder(rowOf<ProcessPS>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<ProcessPS>(kGsmDecoders)));
+ProcessPS::ProcessPS() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "ServingPLMN");
+
 constexpr ValueName kServiceTypeRows[] = {
     {0, 0, "NO_SERVICE"},    {1, 1, "CS_ONLY"},         {2, 2, "PS_ONLY"},
     {3, 3, "CS_PS_SERVICE"}, {4, 4, "LIMITED_SERVICE"},
@@ -76,7 +78,7 @@ constexpr DecoderRules kDecoderRules{"Serving PLMN", kRules};
 
 }  // namespace
 
-ServingPLMN::ServingPLMN() : KeySectionDecoder(rowOf<ServingPLMN>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<ServingPLMN>(kGsmDecoders)));
+ServingPLMN::ServingPLMN() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

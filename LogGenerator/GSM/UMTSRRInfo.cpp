@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "UMTSRRInfo");
+
 constexpr ValueName kRrcStateRows[] = {
     {0, 0, "Disconnected"}, {1, 1, "Connecting"}, {2, 2, "CELL_FACH"},
     {3, 3, "CELL_DCH"},     {4, 4, "CELL_PCH"},   {5, 5, "URA_PCH"},
@@ -91,7 +93,7 @@ constexpr DecoderRules kDecoderRules{"UMTSRRInfo", kRules};
 
 }  // namespace
 
-UMTSRRInfo::UMTSRRInfo() : KeySectionDecoder(rowOf<UMTSRRInfo>(kGsmDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<UMTSRRInfo>(kGsmDecoders)));
+UMTSRRInfo::UMTSRRInfo() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kGsmDecoders, "UMTSSet");
+
 constexpr RecordRule kRules[] = {
     {kLogCodeUmtsIdleMeasurements, 15},
     {kLogCodeCellMonitor, 0},
@@ -40,8 +42,8 @@ constexpr CellMonitorField kNeighbourCellFields[] = {
 
 }  // namespace
 
-UMTSSet::UMTSSet() : TableDecoder(rowOf<UMTSSet>(kGsmDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<UMTSSet>(kGsmDecoders)));
+UMTSSet::UMTSSet() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void UMTSSet::updateWithData(ByteView data, std::int32_t logCode) {
     const RecordRule* rule = admitRecord(kDecoderRules, data, logCode);

@@ -10,6 +10,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "ConnectedModeMeasurementMisc");
+
 using namespace lte_layout::intra_frequency;
 
 constexpr RecordField kFields[] = {
@@ -25,8 +27,7 @@ constexpr DecoderRules kDecoderRules{"Connected mode LTE Intra-frequency Measure
 
 }  // namespace
 
-ConnectedModeMeasurementMisc::ConnectedModeMeasurementMisc()
-    : KeySectionDecoder(rowOf<ConnectedModeMeasurementMisc>(kLteDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<ConnectedModeMeasurementMisc>(kLteDecoders)));
+ConnectedModeMeasurementMisc::ConnectedModeMeasurementMisc() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "DetectedCells");
+
 using namespace lte_layout::intra_frequency;
 
 constexpr RecordRule kRules[] = {{kLogCodeLteIntraFrequency, kMinimumLength}};
@@ -22,8 +24,8 @@ constexpr RecordField kEntryFields[] = {
 
 }  // namespace
 
-DetectedCells::DetectedCells() : TableDecoder(rowOf<DetectedCells>(kLteDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<DetectedCells>(kLteDecoders)));
+DetectedCells::DetectedCells() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void DetectedCells::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

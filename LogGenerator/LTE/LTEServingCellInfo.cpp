@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "LTEServingCellInfo");
+
 constexpr const char* kUarfcnKey = "UARFCN";
 
 constexpr ValueName kBandwidthRows[] = {
@@ -74,8 +76,7 @@ constexpr DecoderRules kDecoderRules{"LTE Serving Cell Info", kRules};
 
 }  // namespace
 
-LTEServingCellInfo::LTEServingCellInfo()
-    : KeySectionDecoder(rowOf<LTEServingCellInfo>(kLteDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<LTEServingCellInfo>(kLteDecoders)));
+LTEServingCellInfo::LTEServingCellInfo() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

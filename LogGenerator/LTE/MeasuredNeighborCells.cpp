@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "MeasuredNeighborCells");
+
 using namespace lte_layout::intra_frequency;
 
 constexpr RecordRule kRules[] = {{kLogCodeLteIntraFrequency, kMinimumLength}};
@@ -25,8 +27,8 @@ constexpr RecordField kEntryFields[] = {
 
 }  // namespace
 
-MeasuredNeighborCells::MeasuredNeighborCells() : TableDecoder(rowOf<MeasuredNeighborCells>(kLteDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<MeasuredNeighborCells>(kLteDecoders)));
+MeasuredNeighborCells::MeasuredNeighborCells() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void MeasuredNeighborCells::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "NeighborCellsList");
+
 using namespace lte_layout::neighbor_measurement;
 
 constexpr RecordRule kRules[] = {{kLogCodeLteIdleNeighbourMeasurement, kMinimumLength}};
@@ -50,8 +52,8 @@ void traceEntry(const RecordReader& record, std::size_t base) {
 
 }  // namespace
 
-NeighborCellsList::NeighborCellsList() : TableDecoder(rowOf<NeighborCellsList>(kLteDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<NeighborCellsList>(kLteDecoders)));
+NeighborCellsList::NeighborCellsList() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void NeighborCellsList::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

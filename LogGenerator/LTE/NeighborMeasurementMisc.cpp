@@ -10,6 +10,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "NeighborMeasurementMisc");
+
 using namespace lte_layout::neighbor_measurement;
 
 constexpr RecordField kFields[] = {
@@ -23,8 +25,7 @@ constexpr DecoderRules kDecoderRules{"Neighbor Measurements", kRules};
 
 }  // namespace
 
-NeighborMeasurementMisc::NeighborMeasurementMisc()
-    : KeySectionDecoder(rowOf<NeighborMeasurementMisc>(kLteDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<NeighborMeasurementMisc>(kLteDecoders)));
+NeighborMeasurementMisc::NeighborMeasurementMisc() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

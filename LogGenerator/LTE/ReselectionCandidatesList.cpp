@@ -13,6 +13,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "ReselectionCandidatesList");
+
 using namespace lte_layout::reselection;
 
 constexpr RecordRule kRules[] = {{kLogCodeLteReselectionCandidates, kMinimumLength}};
@@ -56,9 +58,8 @@ constexpr std::span<const RecordField> kTechnologyFields[] = {kLteFields, kUtran
 
 }  // namespace
 
-ReselectionCandidatesList::ReselectionCandidatesList()
-    : TableDecoder(rowOf<ReselectionCandidatesList>(kLteDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<ReselectionCandidatesList>(kLteDecoders)));
+ReselectionCandidatesList::ReselectionCandidatesList() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void ReselectionCandidatesList::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

@@ -10,6 +10,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "ReselectionCandidatesMisc");
+
 using namespace lte_layout::reselection;
 
 constexpr RecordField kFields[] = {
@@ -23,8 +25,7 @@ constexpr DecoderRules kDecoderRules{"Reselection Candidates", kRules};
 
 }  // namespace
 
-ReselectionCandidatesMisc::ReselectionCandidatesMisc()
-    : KeySectionDecoder(rowOf<ReselectionCandidatesMisc>(kLteDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<ReselectionCandidatesMisc>(kLteDecoders)));
+ReselectionCandidatesMisc::ReselectionCandidatesMisc() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

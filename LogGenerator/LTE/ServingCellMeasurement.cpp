@@ -10,6 +10,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kLteDecoders, "ServingCellMeasurement");
+
 using namespace lte_layout::serving_measurement;
 
 constexpr const char* kNotPresent = "Not Present";
@@ -44,8 +46,7 @@ constexpr DecoderRules kDecoderRules{"Serving Cell Measurements", kRules};
 
 }  // namespace
 
-ServingCellMeasurement::ServingCellMeasurement()
-    : KeySectionDecoder(rowOf<ServingCellMeasurement>(kLteDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<ServingCellMeasurement>(kLteDecoders)));
+ServingCellMeasurement::ServingCellMeasurement() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -12,6 +12,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kUtranDecoders, "CCTRCHSIRMeasurement");
+
 using namespace utran_layout::channel_quality;
 
 constexpr RecordRule kRules[] = {{kLogCodeUtranChannelQuality, kMinimumLength}};
@@ -37,8 +39,8 @@ PlistValue compositeChannelRow(const RecordReader& record, std::size_t base) {
 
 }  // namespace
 
-CCTRCHSIRMeasurement::CCTRCHSIRMeasurement() : TableDecoder(rowOf<CCTRCHSIRMeasurement>(kUtranDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<CCTRCHSIRMeasurement>(kUtranDecoders)));
+CCTRCHSIRMeasurement::CCTRCHSIRMeasurement() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void CCTRCHSIRMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

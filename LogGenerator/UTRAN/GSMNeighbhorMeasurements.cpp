@@ -9,6 +9,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kUtranDecoders, "GSMNeighbhorMeasurements");
+
 constexpr RecordRule kRules[] = {{kLogCodeUtranGsmNeighbourMeasurement, 17}};
 constexpr DecoderRules kDecoderRules{"GSM Neighbor Cell List", kRules, DecoderRules::OtherCodes::Ignored};
 
@@ -28,9 +30,8 @@ constexpr RecordField kEntryFields[] = {
 
 }  // namespace
 
-GSMNeighbhorMeasurements::GSMNeighbhorMeasurements()
-    : TableDecoder(rowOf<GSMNeighbhorMeasurements>(kUtranDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<GSMNeighbhorMeasurements>(kUtranDecoders)));
+GSMNeighbhorMeasurements::GSMNeighbhorMeasurements() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void GSMNeighbhorMeasurements::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

@@ -12,6 +12,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kUtranDecoders, "RRC_State");
+
 constexpr std::size_t kExpectedLength = 15;
 
 constexpr std::size_t kModeValidOffset = 13;
@@ -48,7 +50,7 @@ constexpr DecoderRules kDecoderRules{"RRC Info", kRules, DecoderRules::OtherCode
 
 }  // namespace
 
-RRC_State::RRC_State() : KeySectionDecoder(rowOf<RRC_State>(kUtranDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<RRC_State>(kUtranDecoders)));
+RRC_State::RRC_State() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kUtranDecoders, "TRCHBLERMeasurement");
+
 using namespace utran_layout::channel_quality;
 
 constexpr RecordRule kRules[] = {{kLogCodeUtranChannelQuality, kMinimumLength}};
@@ -24,8 +26,8 @@ constexpr RecordField kEntryFields[] = {
 
 }  // namespace
 
-TRCHBLERMeasurement::TRCHBLERMeasurement() : TableDecoder(rowOf<TRCHBLERMeasurement>(kUtranDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<TRCHBLERMeasurement>(kUtranDecoders)));
+TRCHBLERMeasurement::TRCHBLERMeasurement() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void TRCHBLERMeasurement::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

@@ -10,6 +10,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kUtranDecoders, "UTRANNeighbhorMeasurements");
+
 constexpr RecordRule kRules[] = {{kLogCodeUtranNeighbourMeasurement, 21}};
 constexpr DecoderRules kDecoderRules{"NeighbhorMeasurements List", kRules, DecoderRules::OtherCodes::Ignored};
 
@@ -44,9 +46,8 @@ PlistValue neighborRow(const RecordReader& record, std::size_t base) {
 
 }  // namespace
 
-UTRANNeighbhorMeasurements::UTRANNeighbhorMeasurements()
-    : TableDecoder(rowOf<UTRANNeighbhorMeasurements>(kUtranDecoders)) {}
-static_assert(rulesMatch(kRules, rowOf<UTRANNeighbhorMeasurements>(kUtranDecoders)));
+UTRANNeighbhorMeasurements::UTRANNeighbhorMeasurements() : TableDecoder(kRow) {}
+static_assert(rulesMatch(kRules, kRow));
 
 void UTRANNeighbhorMeasurements::updateWithData(ByteView data, std::int32_t logCode) {
     if (admitRecord(kDecoderRules, data, logCode) == nullptr) {

@@ -11,6 +11,8 @@ namespace velmar {
 
 namespace {
 
+constexpr const DecoderRow& kRow = rowOf(kUtranDecoders, "UTRANServingCellInfo");
+
 constexpr ValueName kAllowedAccessRows[] = {{0, 0, "All Calls"}, {1, 1, "Emergency Calls Only"}};
 constexpr ValueNames kAllowedAccess{kAllowedAccessRows, "Unknown"};
 
@@ -47,8 +49,7 @@ constexpr DecoderRules kDecoderRules{"Serving Cell Info", kRules, DecoderRules::
 
 }  // namespace
 
-UTRANServingCellInfo::UTRANServingCellInfo()
-    : KeySectionDecoder(rowOf<UTRANServingCellInfo>(kUtranDecoders), kDecoderRules) {}
-static_assert(rulesMatch(kRules, rowOf<UTRANServingCellInfo>(kUtranDecoders)));
+UTRANServingCellInfo::UTRANServingCellInfo() : KeySectionDecoder(kRow, kDecoderRules) {}
+static_assert(rulesMatch(kRules, kRow));
 
 }  // namespace velmar

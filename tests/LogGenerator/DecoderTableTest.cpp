@@ -104,12 +104,12 @@ TEST(DecoderTable, SharedDecodersUseOneRowInEveryTable) {
     }
 }
 
-TEST(DecoderTable, RowsAreFoundByDecoderClass) {
-    constexpr const DecoderRow& detected = rowOf<DetectedCells>(kLteDecoders);
+TEST(DecoderTable, RowsAreFoundByDecoderClassName) {
+    constexpr const DecoderRow& detected = rowOf(kLteDecoders, "DetectedCells");
     EXPECT_EQ(detected.section, "Detected Cells");
     EXPECT_EQ(std::string(detected.decoder), "DetectedCells");
-    EXPECT_EQ(&rowOf<CCTRCHSIRMeasurement>(kUtranDecoders), &kUtranDecoders[5]);
-    EXPECT_EQ(&rowOf<HSDPAInformation>(kGsmDecoders), &kGsmDecoders[25]);
+    EXPECT_EQ(&rowOf(kUtranDecoders, "CCTRCHSIRMeasurement"), &kUtranDecoders[5]);
+    EXPECT_EQ(&rowOf(kGsmDecoders, "HSDPAInformation"), &kGsmDecoders[25]);
 }
 
 TEST(DecoderTable, ARowWithoutCodesHasANullCodeArray) {
