@@ -14,6 +14,7 @@
 #include "core/platform/StringFormat.h"
 #include "tests/support/FakeTelephonyService.h"
 #include "tests/support/TestPaths.h"
+#include "tests/ui/TerminalFrame.h"
 #include "ui/terminal/TerminalChartView.h"
 #include "ui/terminal/TerminalFrontEnd.h"
 
@@ -241,13 +242,7 @@ class TerminalChartFrontEndTest : public TerminalChartTest {
             [&] { return frontEnd.shell().model()->history().newestTime() > newest; }, 5.0));
     }
     std::vector<std::string> frame(TerminalFrontEnd& frontEnd, int rows = 12, int columns = 60) {
-        TerminalCanvas canvas(rows, columns, false);
-        frontEnd.render(canvas);
-        std::vector<std::string> lines;
-        for (int row = 0; row < rows; ++row) {
-            lines.push_back(canvas.rowText(row));
-        }
-        return lines;
+        return testing::terminalFrame(frontEnd, rows, columns);
     }
 
     testing::TemporaryDirectory runtime_;

@@ -15,6 +15,7 @@
 #include "tests/support/FakeTelephonyService.h"
 #include "tests/support/LogCapture.h"
 #include "tests/support/TestPaths.h"
+#include "tests/ui/TerminalFrame.h"
 #include "ui/terminal/TerminalCanvas.h"
 #include "ui/terminal/TerminalFrontEnd.h"
 #include "ui/terminal/TerminalPaneView.h"
@@ -300,13 +301,7 @@ class TerminalFrontEndTest : public Utf8Locale {
         ASSERT_TRUE(frontEnd.queue().runUntil([&] { return frontEnd.topPane().node() != nullptr; }, 5.0));
     }
     std::vector<std::string> frame(TerminalFrontEnd& frontEnd, int rows = 8, int columns = 40) {
-        TerminalCanvas canvas(rows, columns, false);
-        frontEnd.render(canvas);
-        std::vector<std::string> lines;
-        for (int row = 0; row < rows; ++row) {
-            lines.push_back(canvas.rowText(row));
-        }
-        return lines;
+        return testing::terminalFrame(frontEnd, rows, columns);
     }
 
     testing::TemporaryDirectory runtime_;
