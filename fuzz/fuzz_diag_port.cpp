@@ -9,7 +9,7 @@
 #include <cstdint>
 
 #include "core/platform/PollMainQueue.h"
-#include "core/platform/SystemLog.h"
+#include "fuzz/QuietStart.h"
 #include "logfile/DiagFraming.h"
 #include "logfile/DiagStreamDeframer.h"
 #include "service/live/DiagCommands.h"
@@ -61,13 +61,13 @@ LogCodeFilter demandOf(std::initializer_list<std::uint16_t> codes) {
 }  // namespace
 }  // namespace velmar
 
+extern "C" int LLVMFuzzerInitialize(int*, char***) {
+    velmar::fuzzing::quietStart();
+    return 0;
+}
+
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     using namespace velmar;
-    static const bool quiet = [] {
-        SystemLog::setSink([](int, const std::string&) {});
-        return true;
-    }();
-    (void)quiet;
     if (size == 0) {
         return 0;
     }

@@ -7,7 +7,6 @@
 // parser's, is an expected outcome.
 #include <cstddef>
 #include <cstdint>
-#include <cstdio>
 #include <memory>
 #include <string_view>
 
@@ -20,6 +19,7 @@
 #include "core/platform/KxServerProtocol.h"
 #include "core/platform/RecordReader.h"
 #include "core/platform/SystemLog.h"
+#include "fuzz/QuietStart.h"
 
 namespace velmar {
 namespace {
@@ -78,10 +78,7 @@ void showTree(const PlistValue& display) {
 }  // namespace velmar
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
-    velmar::SystemLog::setSink([](int, const std::string&) {});
-    velmar::SystemLog::setThreshold(velmar::kLogDebug);  // format every line: the texts are part of the path
-    // Class indexes write a line to standard output when they go; keep the fuzzer's output readable.
-    std::freopen("/dev/null", "w", stdout);
+    velmar::fuzzing::quietStart(velmar::kLogDebug);  // format every line: the texts are part of the path
     return 0;
 }
 

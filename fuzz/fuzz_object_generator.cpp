@@ -14,8 +14,8 @@
 #include "LogGenerator/GSM/GSMLogGenerator.h"
 #include "LogGenerator/GSM/InternalInconsistencyException.h"
 #include "LogGenerator/StateKeys.h"
-#include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
+#include "fuzz/QuietStart.h"
 
 namespace velmar {
 namespace {
@@ -69,13 +69,13 @@ void checkCollapsed(const PlistValue& value, bool top) {
 }  // namespace
 }  // namespace velmar
 
+extern "C" int LLVMFuzzerInitialize(int*, char***) {
+    velmar::fuzzing::quietStart();
+    return 0;
+}
+
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     using namespace velmar;
-    static const bool quiet = [] {
-        SystemLog::setSink([](int, const std::string&) {});
-        return true;
-    }();
-    (void)quiet;
 
     const ByteView blob(data, size);
     const std::optional<PlistValue> parsed = parsePropertyList(blob);

@@ -8,7 +8,6 @@
 // fuzz_intake), and an adapted record's length field must match its length.
 #include <cstddef>
 #include <cstdint>
-#include <cstdio>
 #include <cstdlib>
 #include <memory>
 #include <string_view>
@@ -17,7 +16,7 @@
 #include "LogGenerator/GSM/LogCode_0xFF0000.h"
 #include "LogGenerator/LogGenerator.h"
 #include "core/platform/KxServerProtocol.h"
-#include "core/platform/SystemLog.h"
+#include "fuzz/QuietStart.h"
 #include "logfile/PacketCensus.h"
 #include "logfile/PacketVersionAdapter.h"
 
@@ -39,9 +38,7 @@ bool rewritten(const AdaptedPacket& packet) {
 }  // namespace
 
 extern "C" int LLVMFuzzerInitialize(int*, char***) {
-    velmar::SystemLog::setSink([](int, const std::string&) {});
-    // Class indexes write a line to standard output when they go; keep the fuzzer's output readable.
-    std::freopen("/dev/null", "w", stdout);
+    velmar::fuzzing::quietStart();
     return 0;
 }
 
