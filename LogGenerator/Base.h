@@ -5,8 +5,8 @@
 // occurrence). The display side binds it to its section's container with updateSectionRef; the reference is
 // not owned, so a decoder whose section has gone writes nowhere. updateWithData, getSectionName and
 // getLogCodeArray are abstract here. Decoders are always owned by a shared_ptr (initWithDict makes one),
-// because the subscriber arrays hold them too. List sections are emptied or replaced only under ArrayLock, through
-// clearElementsInArray and replaceArray, so that the display never sees a half-replaced list.
+// because the subscriber arrays hold them too. List sections are emptied or replaced only under ArrayLock,
+// through clearElementsInArray and replaceArray, so that the display never sees a half-replaced list.
 #pragma once
 
 #include <cstdint>
@@ -31,7 +31,7 @@ using CodeDictionary = InsertionOrderedMap<DecoderList>;
 using LogCodeArray = std::optional<std::vector<std::int32_t>>;
 
 class Base : public std::enable_shared_from_this<Base> {
-public:
+  public:
     Base() = default;
     virtual ~Base() = default;
     Base(const Base&) = delete;
@@ -58,12 +58,12 @@ public:
         return decoder;
     }
 
-protected:
+  protected:
     // The bound section, or null when unbound, gone, or of the other container type.
     PlistDictionaryRef sectionDictionary() const { return sectionRef.dictionary.lock(); }
     PlistArrayRef sectionArray() const { return sectionRef.array.lock(); }
 
-private:
+  private:
     struct SectionReference {
         std::weak_ptr<PlistDictionary> dictionary;
         std::weak_ptr<PlistArray> array;

@@ -47,14 +47,16 @@ PlistArrayRef parseCells(ByteView body) {
 }  // namespace
 
 CellInfoArray::CellInfoArray(ByteView record) {
-    const ByteView body = record.size() > kRecordHeaderLength ? record.subspan(kRecordHeaderLength) : ByteView();
+    const ByteView body =
+        record.size() > kRecordHeaderLength ? record.subspan(kRecordHeaderLength) : ByteView();
     cells_ = parseCells(body);
     if (!cells_) {
         SystemLog::log(kLogError, "Cell Info Array data could not be constructed");
     }
 }
 
-bool CellInfoArray::cellMatches(const PlistValue& entry, std::string_view technology, std::string_view cellType) {
+bool CellInfoArray::cellMatches(const PlistValue& entry, std::string_view technology,
+                                std::string_view cellType) {
     const PlistDictionaryRef& cell = entry.dictionary();
     if (!cell) {
         return false;

@@ -21,9 +21,10 @@ std::uint64_t packDlfTimeInfo(std::uint32_t secondsSince1970, std::int16_t zoneO
 
 // Writes the record to the start of buffer. Returns 0 and sets outLength to 161 on success; returns 3 and
 // writes nothing (outLength 0) when bufferLength is under 161.
-std::int32_t MoxDLFAddVersionReport(std::uint8_t* buffer, std::uint32_t bufferLength, std::uint32_t* outLength,
-                                    std::uint16_t firstNumber, std::uint16_t secondNumber,
-                                    const char* versionText, const char* executableName,
-                                    const char* buildDateText, std::uint64_t timeInfo);
+std::int32_t MoxDLFAddVersionReport(std::uint8_t* buffer, std::uint32_t bufferLength,
+                                    std::uint32_t* outLength, std::uint16_t firstNumber,
+                                    std::uint16_t secondNumber, const char* versionText,
+                                    const char* executableName, const char* buildDateText,
+                                    std::uint64_t timeInfo);
 
 }  // namespace velmar

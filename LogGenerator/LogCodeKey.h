@@ -10,14 +10,14 @@
 namespace velmar {
 
 class LogCodeKey {
-public:
+  public:
     explicit LogCodeKey(std::int32_t code) {
         const auto result = std::to_chars(text_.data(), text_.data() + text_.size(), code);
         length_ = static_cast<std::size_t>(result.ptr - text_.data());
     }
     std::string_view view() const { return std::string_view(text_.data(), length_); }
 
-private:
+  private:
     std::array<char, 12> text_{};
     std::size_t length_ = 0;
 };

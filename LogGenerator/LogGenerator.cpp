@@ -12,7 +12,9 @@ namespace {
 constexpr std::size_t kHistoryLimit = 5;
 }
 
-LogGenerator::LogGenerator() { SystemLog::log(kLogWarning, "Creating Log object: %p", static_cast<void*>(this)); }
+LogGenerator::LogGenerator() {
+    SystemLog::log(kLogWarning, "Creating Log object: %p", static_cast<void*>(this));
+}
 
 void LogGenerator::updateState(const StateDict&, ByteView) {
     throw NotImplementedError("updateState:withData:");
@@ -20,7 +22,9 @@ void LogGenerator::updateState(const StateDict&, ByteView) {
 PlistValue LogGenerator::generateLogUsingState(const StateDict&) {
     throw NotImplementedError("generateLogUsingState:");
 }
-PlistValue LogGenerator::getStartCommand() { throw NotImplementedError("getStartCommand"); }
+PlistValue LogGenerator::getStartCommand() {
+    throw NotImplementedError("getStartCommand");
+}
 PlistValue LogGenerator::getSaveContentsFromState(const StateDict&) {
     throw NotImplementedError("getSaveContentsFromState:");
 }

@@ -20,7 +20,7 @@ namespace velmar {
 using StateDict = PlistDictionaryRef;
 
 class LogGenerator : public MonitorGenerator {
-public:
+  public:
     ~LogGenerator() override = default;
     LogGenerator(const LogGenerator&) = delete;
     LogGenerator& operator=(const LogGenerator&) = delete;
@@ -36,7 +36,7 @@ public:
     // A new generator for the technology name, or null when no generator serves it.
     static std::unique_ptr<LogGenerator> generatorFromTechnology(std::string_view technology);
 
-protected:
+  protected:
     // Plain initialisation: logs "Creating Log object: %p".
     LogGenerator();
     // For a subclass that hands back an object without running any initialisation of its bases.

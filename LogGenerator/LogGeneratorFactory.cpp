@@ -4,8 +4,8 @@
 
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 #include "LogGenerator/GSM/GSMLogGenerator.h"
-#include "LogGenerator/LTE/LTELogGenerator.h"
 #include "LogGenerator/GSM/ORV_GSMLogGenerator.h"
+#include "LogGenerator/LTE/LTELogGenerator.h"
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/UTRAN/UTRANLogGenerator.h"
 #include "core/platform/KxServerProtocol.h"

@@ -8,7 +8,7 @@
 namespace velmar {
 
 class NotImplementedError : public std::logic_error {
-public:
+  public:
     explicit NotImplementedError(const std::string& operation)
         : std::logic_error(operation + " is not implemented by this class") {}
 };

@@ -11,7 +11,9 @@ namespace velmar {
 
 ORVLogGenerator::ORVLogGenerator() : _binData(std::make_shared<PlistData>()) {}
 
-std::optional<std::string> ORVLogGenerator::applicationVersion() const { return BuildInfo::applicationVersion(); }
+std::optional<std::string> ORVLogGenerator::applicationVersion() const {
+    return BuildInfo::applicationVersion();
+}
 
 std::string ORVLogGenerator::dlfVersionText(const std::optional<std::string>& applicationVersion) {
     return applicationVersion ? "Velmar " + *applicationVersion : std::string("(none)");
@@ -53,7 +55,8 @@ PlistDataRef ORVLogGenerator::generateDlfFromState(const StateDict& state) {
             }
             const PlistDataRef& bytes = displayState->dataValue();
             if (!bytes) {
-                SystemLog::log(kLogRaw16, "Got wrong class writing history to DLF; aborting writing the DLF file");
+                SystemLog::log(kLogRaw16,
+                               "Got wrong class writing history to DLF; aborting writing the DLF file");
                 return nullptr;
             }
             if (bytes->size() >= 2) {

@@ -14,7 +14,7 @@
 namespace velmar {
 
 class ORVLogGenerator : public LogGenerator {
-public:
+  public:
     PlistValue getSaveContentsFromState(const StateDict& state) override;
     // The DLF file of the state's history, or null (logged with priority 16) when it cannot be built.
     PlistDataRef generateDlfFromState(const StateDict& state);
@@ -22,7 +22,7 @@ public:
     // "Velmar <version>" when the application has a version string, else "(none)".
     static std::string dlfVersionText(const std::optional<std::string>& applicationVersion);
 
-protected:
+  protected:
     ORVLogGenerator();
     explicit ORVLogGenerator(Uninitialized tag) : LogGenerator(tag) {}
 

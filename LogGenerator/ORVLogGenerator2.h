@@ -24,7 +24,7 @@
 namespace velmar {
 
 class ORVLogGenerator2 : public ORVLogGenerator {
-public:
+  public:
     ~ORVLogGenerator2() override;
 
     void updateState(const StateDict& state, ByteView data) override;
@@ -38,7 +38,7 @@ public:
     const ClassIndex* classIndex() const { return cIndex.get(); }
     const std::string& templateName() const { return pListName; }
 
-protected:
+  protected:
     // The result of a subclass's creation line, logged before any base initialisation runs.
     struct Announcement {};
     static Announcement announce(const char* creationLine);
@@ -52,17 +52,17 @@ protected:
     std::string pListName;
     std::shared_ptr<ClassIndex> cIndex;
 
-private:
-  struct CreationNoted {};
-  // Binds the decoders to the kept display; false (display and template removed) when another template
-  // built it.
-  bool adoptKeptDisplay(const StateDict& state, const PlistValue& display);
-  void bindSections(const PlistValue& displayValue);
-  static CreationNoted noteCreation(const ClassIndex* classIndex);
-  ORVLogGenerator2(CreationNoted, std::string templateName, std::shared_ptr<ClassIndex> classIndex);
+  private:
+    struct CreationNoted {};
+    // Binds the decoders to the kept display; false (display and template removed) when another template
+    // built it.
+    bool adoptKeptDisplay(const StateDict& state, const PlistValue& display);
+    void bindSections(const PlistValue& displayValue);
+    static CreationNoted noteCreation(const ClassIndex* classIndex);
+    ORVLogGenerator2(CreationNoted, std::string templateName, std::shared_ptr<ClassIndex> classIndex);
 
-  // The display tree the decoders are bound to (not owned: the state owns it).
-  std::weak_ptr<PlistDictionary> boundDisplay_;
+    // The display tree the decoders are bound to (not owned: the state owns it).
+    std::weak_ptr<PlistDictionary> boundDisplay_;
 };
 
 }  // namespace velmar

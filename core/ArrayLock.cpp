@@ -36,7 +36,9 @@ void ArrayLock::unlockArray() {
     }
 }
 
-std::uint8_t ArrayLock::nestingCounter() { return state().counter; }
+std::uint8_t ArrayLock::nestingCounter() {
+    return state().counter;
+}
 
 bool ArrayLock::isFreeForOtherThreads() {
     bool free = false;
@@ -50,7 +52,9 @@ bool ArrayLock::isFreeForOtherThreads() {
     return free;
 }
 
-std::uint64_t ArrayLock::outstandingAcquisitions() { return state().outstanding; }
+std::uint64_t ArrayLock::outstandingAcquisitions() {
+    return state().outstanding;
+}
 
 void ArrayLock::releaseOutstandingForTesting() {
     ArrayLockState& s = state();

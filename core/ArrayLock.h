@@ -12,7 +12,7 @@
 namespace velmar {
 
 class ArrayLock {
-public:
+  public:
     ArrayLock() = delete;
 
     static void lockArray();

@@ -13,7 +13,7 @@
 namespace velmar {
 
 class MonitorGenerator {
-public:
+  public:
     virtual ~MonitorGenerator() = default;
     // Consumes one received blob into the state dictionary.
     virtual void updateState(const PlistDictionaryRef& state, ByteView data) = 0;

@@ -25,7 +25,9 @@ VelmarModel::~VelmarModel() {
     destroyPorts();
 }
 
-bool VelmarModel::isConnected() const { return _recvPort != nullptr && _sendPort != nullptr; }
+bool VelmarModel::isConnected() const {
+    return _recvPort != nullptr && _sendPort != nullptr;
+}
 
 void VelmarModel::destroyPorts() {
     if (_displayUpdateTimer != 0) {
@@ -115,7 +117,9 @@ void VelmarModel::refresh() {
     });
 }
 
-void VelmarModel::refresh(const void*) { refresh(); }
+void VelmarModel::refresh(const void*) {
+    refresh();
+}
 
 void VelmarModel::updateWithData(ByteView data) {
     if (_logGenerator) {

@@ -28,13 +28,13 @@
 namespace velmar {
 
 class VelmarModelDelegate {
-public:
+  public:
     virtual ~VelmarModelDelegate() = default;
     virtual void updateViewControllerFromModel() = 0;
 };
 
 class VelmarModel {
-public:
+  public:
     static constexpr double kDisplayIntervalSeconds = 2.0;
     static constexpr double kRetryDelaySeconds = 5.0;
 
@@ -65,7 +65,7 @@ public:
     void setReceivePortName(std::string name) { receivePortName_ = std::move(name); }
     const ValueHistory& history() const { return history_; }
 
-private:
+  private:
     std::optional<PlistData> onLogChannelMessage(std::int32_t messageId, ByteView data);
     void onLogChannelInvalidated(MessagePort* port);
     void onTelephonyServiceEvent();

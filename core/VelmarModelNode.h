@@ -26,7 +26,7 @@ using NodeList = std::vector<VelmarModelNodeRef>;
 using NodePathDictionary = InsertionOrderedMap<VelmarModelNodeRef>;
 
 class VelmarModelNode {
-public:
+  public:
     explicit VelmarModelNode(std::string name) : _name(std::move(name)) {}
     virtual ~VelmarModelNode() = default;
 
@@ -38,27 +38,27 @@ public:
 
     static VelmarModelNodeRef makeTreeFromObject(const PlistValue& object, NodePathDictionary& paths);
 
-private:
+  private:
     std::string _name;
 };
 
 class VelmarModelLeafNode : public VelmarModelNode {
-public:
+  public:
     VelmarModelLeafNode(std::string name, std::string value)
         : VelmarModelNode(std::move(name)), _string(std::move(value)) {}
     const std::string* value() const override { return &_string; }
 
-private:
+  private:
     std::string _string;
 };
 
 class VelmarModelTreeNode : public VelmarModelNode {
-public:
+  public:
     VelmarModelTreeNode(std::string name, NodeList children)
         : VelmarModelNode(std::move(name)), _childNodes(std::move(children)) {}
     const NodeList* childNodes() const override { return &_childNodes; }
 
-private:
+  private:
     NodeList _childNodes;
 };
 

@@ -3,9 +3,9 @@
 //   velmar [--terminal | --headless [--path PATH]] [--fullscreen] [--log-stderr]
 //
 // Contract: parseMonitorOptions reads the arguments after the program name with the one command-line parser
-// (core/platform/CommandLine.h). It answers the options, or help, or the version, or a one-line usage error: an unknown
-// argument, a missing value, both front ends, or --path without --headless. Whether --fullscreen can be
-// honoured depends on the front end that the session offers, so main() checks that after choosing it.
+// (core/platform/CommandLine.h). It answers the options, or help, or the version, or a one-line usage error:
+// an unknown argument, a missing value, both front ends, or --path without --headless. Whether --fullscreen
+// can be honoured depends on the front end that the session offers, so main() checks that after choosing it.
 #pragma once
 
 #include <string>

@@ -12,7 +12,7 @@
 namespace velmar {
 
 class Pane {
-public:
+  public:
     virtual ~Pane() = default;
     virtual const std::string& path() const = 0;
     virtual void reloadWithNode(const VelmarModelNodeRef& node) = 0;
@@ -21,7 +21,7 @@ public:
 
 // The navigation stack as the shell sees it: panes bottom first.
 class NavigationStack {
-public:
+  public:
     virtual ~NavigationStack() = default;
     virtual std::size_t paneCount() const = 0;
     virtual Pane& paneAt(std::size_t index) = 0;

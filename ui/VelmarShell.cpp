@@ -12,7 +12,9 @@ namespace velmar {
 VelmarShell::VelmarShell(GeneratorFactory factory, MainQueue& queue)
     : factory_(std::move(factory)), queue_(queue) {}
 
-VelmarShell::~VelmarShell() { *alive_ = false; }
+VelmarShell::~VelmarShell() {
+    *alive_ = false;
+}
 
 std::string VelmarShell::internalBuildMarkerPath() {
     const char* sysroot = std::getenv("VELMAR_SYSROOT");
@@ -98,7 +100,9 @@ void VelmarShell::updateStatusForViewController(Pane& pane) {
     }
 }
 
-void VelmarShell::navigationWillShow(Pane& pane) { updateStatusForViewController(pane); }
+void VelmarShell::navigationWillShow(Pane& pane) {
+    updateStatusForViewController(pane);
+}
 
 void VelmarShell::updateViewControllerFromModel() {
     if (!_model || _navController == nullptr) {

@@ -4,9 +4,13 @@
 
 namespace velmar {
 
-std::optional<std::string> BuildInfo::applicationVersion() { return std::string(VELMAR_VERSION_STRING); }
+std::optional<std::string> BuildInfo::applicationVersion() {
+    return std::string(VELMAR_VERSION_STRING);
+}
 
-std::string BuildInfo::buildDateTime() { return __DATE__ " " __TIME__; }
+std::string BuildInfo::buildDateTime() {
+    return __DATE__ " " __TIME__;
+}
 
 std::string BuildInfo::versionText(std::string_view program) {
     std::string text(program);

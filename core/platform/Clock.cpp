@@ -48,6 +48,8 @@ std::string Clock::localText(double secondsSince1970, const char* strftimeFormat
     return std::string(text, length);
 }
 
-void Clock::setNowForTesting(std::optional<double> pinned) { pinnedNow() = pinned; }
+void Clock::setNowForTesting(std::optional<double> pinned) {
+    pinnedNow() = pinned;
+}
 
 }  // namespace velmar

@@ -16,7 +16,7 @@ struct LocalZoneInfo {
 };
 
 class Clock {
-public:
+  public:
     static double now();
     static LocalZoneInfo localZoneAt(std::int64_t secondsSince1970);
     // "YYYY-MM-DD HH:MM:SS +0000" of the instant, in UTC.

@@ -17,7 +17,7 @@ namespace velmar {
 
 template <typename Value>
 class InsertionOrderedMap {
-public:
+  public:
     using Entry = std::pair<std::string, Value>;
     static constexpr std::size_t kIndexThreshold = 12;
 
@@ -81,7 +81,7 @@ public:
     auto begin() const { return entries_.begin(); }
     auto end() const { return entries_.end(); }
 
-private:
+  private:
     static constexpr std::size_t npos = static_cast<std::size_t>(-1);
 
     struct TransparentHash {

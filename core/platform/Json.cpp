@@ -146,7 +146,9 @@ void appendJsonString(std::string& out, std::string_view text) {
     out.push_back('"');
 }
 
-void appendPlistJson(std::string& out, const PlistValue& value, int indent) { appendValue(out, value, indent, 0); }
+void appendPlistJson(std::string& out, const PlistValue& value, int indent) {
+    appendValue(out, value, indent, 0);
+}
 
 std::string plistToJson(const PlistValue& value, int indent) {
     std::string out;

@@ -66,7 +66,8 @@ inline std::string monitorReceivePortName(long pid) {
 // Control messages (XML property lists, message id 0). A client asks
 //   {"Request": "CreateLogChannel", "ReceivePort": <name of the client's local port>}
 // and the service answers
-//   {"Domain": <integer>, "Error": <integer, 0 on success>, "ChannelPort": <name>, "Reason": <text on failure>}
+//   {"Domain": <integer>, "Error": <integer, 0 on success>, "ChannelPort": <name>, "Reason": <text on
+//   failure>}
 // after which the service connects to the receive port and streams blobs (message id 0) there, and listens on
 // ChannelPort for that channel's commands ("GetTechnology", the start command). Notifications from the
 // service arrive on the control connection as {"Notification": <name>, "Data": <any>}.
@@ -86,8 +87,9 @@ inline constexpr std::int32_t kKxErrorCannotReachReceivePort = 2;
 inline constexpr std::int32_t kKxErrorCannotOpenChannelPort = 3;
 inline constexpr std::int32_t kKxErrorTooManyChannels = 4;
 
-// Channel commands: {"GetTechnology": "GetTechnology"} answered with {"GetTechnology": <technology constant>};
-// the start command {"SetState": "Streaming", "SetOrvaneLogCodes": [...], "SetKxExtraCodes": [...]}.
+// Channel commands: {"GetTechnology": "GetTechnology"} answered with {"GetTechnology": <technology
+// constant>}; the start command {"SetState": "Streaming", "SetOrvaneLogCodes": [...], "SetKxExtraCodes":
+// [...]}.
 inline constexpr std::string_view kKxGetTechnologyKey = "GetTechnology";
 inline constexpr std::string_view kKxSetStateKey = "SetState";
 inline constexpr std::string_view kKxStreamingState = "Streaming";

@@ -94,14 +94,14 @@ Listener probeListener(const std::string& path, int* error = nullptr) {
 
 int remainingMs(std::chrono::steady_clock::time_point deadline) {
     const auto left =
-        std::chrono::duration_cast<std::chrono::milliseconds>(deadline - std::chrono::steady_clock::now()).count();
+        std::chrono::duration_cast<std::chrono::milliseconds>(deadline - std::chrono::steady_clock::now())
+            .count();
     return left <= 0 ? 0 : static_cast<int>(left);
 }
 
 std::chrono::steady_clock::time_point deadlineAfter(double seconds) {
-    return std::chrono::steady_clock::now() +
-           std::chrono::duration_cast<std::chrono::steady_clock::duration>(
-               std::chrono::duration<double>(seconds < 0 ? 0 : seconds));
+    return std::chrono::steady_clock::now() + std::chrono::duration_cast<std::chrono::steady_clock::duration>(
+                                                  std::chrono::duration<double>(seconds < 0 ? 0 : seconds));
 }
 
 enum class SendOutcome { Sent, TimedOut, Broken };
@@ -207,7 +207,9 @@ bool processRuns(pid_t pid) {
 
 MessagePort::MessagePort(std::string name, bool local) : name_(std::move(name)), local_(local) {}
 
-MessagePort::~MessagePort() { closeEverything(); }
+MessagePort::~MessagePort() {
+    closeEverything();
+}
 
 std::shared_ptr<MessagePort> MessagePort::createLocal(const std::string& name, MessageCallback callback,
                                                       bool* alreadyExists, LocalMode mode,
@@ -373,7 +375,9 @@ void MessagePort::setInvalidationCallback(InvalidationCallback callback) {
     invalidationCallback_ = std::move(callback);
 }
 
-void MessagePort::setNotificationCallback(MessageCallback callback) { notificationCallback_ = std::move(callback); }
+void MessagePort::setNotificationCallback(MessageCallback callback) {
+    notificationCallback_ = std::move(callback);
+}
 
 void MessagePort::watchConnection(Connection& connection) {
     if (queue_ == nullptr) {
@@ -666,7 +670,8 @@ void MessagePort::readRemote() {
 }
 
 std::int32_t MessagePort::sendRequest(std::int32_t messageId, ByteView data, double sendTimeout,
-                                      double receiveTimeout, bool wantReply, std::optional<PlistData>* reply) {
+                                      double receiveTimeout, bool wantReply,
+                                      std::optional<PlistData>* reply) {
     if (reply) {
         reply->reset();
     }

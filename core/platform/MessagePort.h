@@ -154,7 +154,7 @@ class MessagePort : public std::enable_shared_from_this<MessagePort> {
     MainQueue::Handle listenWatch_ = 0;
     MainQueue::Handle acceptRetry_ = 0;
     MainQueue::Handle writableWatch_ = 0;  // remote ports: whenWritable
-    double acceptBackoff_ = 0;  // seconds; 0 while accepting works
+    double acceptBackoff_ = 0;             // seconds; 0 while accepting works
     std::map<int, Connection> connections_;
     std::size_t maxConnections_ = kDefaultMaxConnections;
     pid_t onlyPid_ = 0;

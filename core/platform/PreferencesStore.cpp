@@ -33,11 +33,17 @@ std::string PreferencesStore::directory() {
     return base + "/velmar/preferences";
 }
 
-std::string PreferencesStore::filePath() const { return directory() + "/" + domain_ + ".plist"; }
+std::string PreferencesStore::filePath() const {
+    return directory() + "/" + domain_ + ".plist";
+}
 
-PlistValue PreferencesStore::value(const std::string& key) const { return values_->get(key); }
+PlistValue PreferencesStore::value(const std::string& key) const {
+    return values_->get(key);
+}
 
-void PreferencesStore::setValue(const std::string& key, PlistValue value) { values_->set(key, std::move(value)); }
+void PreferencesStore::setValue(const std::string& key, PlistValue value) {
+    values_->set(key, std::move(value));
+}
 
 bool PreferencesStore::synchronize() {
     std::error_code error;

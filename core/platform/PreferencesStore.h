@@ -14,7 +14,7 @@
 namespace velmar {
 
 class PreferencesStore {
-public:
+  public:
     explicit PreferencesStore(std::string domain);
 
     static std::string directory();
@@ -26,7 +26,7 @@ public:
 
     static constexpr const char* kHomeScreenDomain = "com.velmar.homescreen";
 
-private:
+  private:
     std::string domain_;
     PlistDictionaryRef values_;
 };

@@ -37,7 +37,8 @@ std::vector<std::string> Resources::searchDirectories() {
     candidates.emplace_back(VELMAR_SOURCE_TEMPLATE_DIR);
     std::vector<std::string> existing;
     for (const auto& candidate : candidates) {
-        if (isDirectory(candidate) && std::find(existing.begin(), existing.end(), candidate) == existing.end()) {
+        if (isDirectory(candidate) &&
+            std::find(existing.begin(), existing.end(), candidate) == existing.end()) {
             existing.push_back(candidate);
         }
     }

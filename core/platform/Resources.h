@@ -13,7 +13,7 @@
 namespace velmar {
 
 class Resources {
-public:
+  public:
     static std::vector<std::string> searchDirectories();
     static std::optional<std::string> pathForResource(const std::string& name, const std::string& type);
     // Every file of that type, directory by directory in search order, each directory's files by name.

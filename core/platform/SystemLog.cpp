@@ -23,11 +23,15 @@ LogSettings& settings() {
 }
 
 // The priority that filtering and syslog(3) see: anything outside syslog's 0..7 counts as an error.
-int effectivePriority(int priority) { return (priority < 0 || priority > kLogDebug) ? kLogError : priority; }
+int effectivePriority(int priority) {
+    return (priority < 0 || priority > kLogDebug) ? kLogError : priority;
+}
 
 }  // namespace
 
-bool SystemLog::isEnabled(int priority) { return effectivePriority(priority) <= settings().threshold; }
+bool SystemLog::isEnabled(int priority) {
+    return effectivePriority(priority) <= settings().threshold;
+}
 
 void SystemLog::log(int priority, const char* format, ...) {
     if (!isEnabled(priority)) {
@@ -67,8 +71,11 @@ int SystemLog::parseLevel(const std::string& text) {
     static const struct {
         const char* name;
         int priority;
-    } kNames[] = {{"error", kLogError}, {"warning", kLogWarning}, {"notice", kLogNotice},
-                  {"info", kLogInfo},   {"debug", kLogDebug}};
+    } kNames[] = {{"error", kLogError},
+                  {"warning", kLogWarning},
+                  {"notice", kLogNotice},
+                  {"info", kLogInfo},
+                  {"debug", kLogDebug}};
     for (const auto& entry : kNames) {
         if (text == entry.name) {
             return entry.priority;
@@ -90,9 +97,17 @@ void SystemLog::configureFromEnvironment(const char* programName) {
     }
 }
 
-void SystemLog::setThreshold(int priority) { settings().threshold = priority; }
-int SystemLog::threshold() { return settings().threshold; }
-void SystemLog::setMirrorToStderr(bool mirror) { settings().mirrorToStderr = mirror; }
-void SystemLog::setSink(Sink sink) { settings().sink = std::move(sink); }
+void SystemLog::setThreshold(int priority) {
+    settings().threshold = priority;
+}
+int SystemLog::threshold() {
+    return settings().threshold;
+}
+void SystemLog::setMirrorToStderr(bool mirror) {
+    settings().mirrorToStderr = mirror;
+}
+void SystemLog::setSink(Sink sink) {
+    settings().sink = std::move(sink);
+}
 
 }  // namespace velmar

@@ -22,7 +22,7 @@ inline constexpr int kLogDebug = 7;
 inline constexpr int kLogRaw16 = 16;
 
 class SystemLog {
-public:
+  public:
     using Sink = std::function<void(int priority, const std::string& text)>;
 
     static void log(int priority, const char* format, ...) __attribute__((format(printf, 2, 3)));

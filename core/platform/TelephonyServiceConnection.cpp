@@ -21,7 +21,8 @@ std::unique_ptr<TelephonyServiceConnection> TelephonyServiceConnection::create(N
         const PlistDictionaryRef fields = message ? message->dictionary() : nullptr;
         const std::string* name = fields ? fields->get(kKxNotificationKey).string() : nullptr;
         if (callback) {
-            callback(name ? *name : std::string(), fields ? fields->get(kKxNotificationDataKey) : PlistValue());
+            callback(name ? *name : std::string(),
+                     fields ? fields->get(kKxNotificationDataKey) : PlistValue());
         }
         return std::nullopt;
     });
@@ -54,7 +55,8 @@ TelephonyServiceConnection::Status TelephonyServiceConnection::createLogChannel(
     }
     Status status;
     status.domain = static_cast<std::int32_t>(fields->get(kKxDomainKey).integerValue().value_or(0));
-    status.error = static_cast<std::int32_t>(fields->get(kKxErrorKey).integerValue().value_or(kKxErrorBadRequest));
+    status.error =
+        static_cast<std::int32_t>(fields->get(kKxErrorKey).integerValue().value_or(kKxErrorBadRequest));
     if (const std::string* reason = fields->get(kKxReasonKey).string()) {
         status.reason = *reason;
     }

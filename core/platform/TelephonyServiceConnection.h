@@ -20,7 +20,7 @@
 namespace velmar {
 
 class TelephonyServiceConnection {
-public:
+  public:
     using NotificationCallback = std::function<void(const std::string& name, const PlistValue& data)>;
     struct Status {
         std::int32_t domain = 0;
@@ -28,14 +28,16 @@ public:
         std::string reason;  // the service's own words on a refusal, for diagnostics
     };
 
-    static std::unique_ptr<TelephonyServiceConnection> create(NotificationCallback callback, MainQueue& queue);
+    static std::unique_ptr<TelephonyServiceConnection> create(NotificationCallback callback,
+                                                              MainQueue& queue);
 
     Status createLogChannel(const std::string& receivePortName, std::optional<std::string>* remotePortName);
     // The service's process, so that the receive port can take its connections only; 0 when unknown.
     pid_t servicePid() const;
 
   private:
-    explicit TelephonyServiceConnection(std::shared_ptr<MessagePort> control) : control_(std::move(control)) {}
+    explicit TelephonyServiceConnection(std::shared_ptr<MessagePort> control)
+        : control_(std::move(control)) {}
     std::shared_ptr<MessagePort> control_;
 };
 

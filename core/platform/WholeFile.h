@@ -22,7 +22,7 @@ namespace velmar {
 struct FileOutcome {
     std::string_view failedStep;  // "cannot open", "cannot read", "cannot create", "cannot open for
                                   // appending", "cannot write"; empty on success
-    int errorNumber = 0;  // the errno of the failed step
+    int errorNumber = 0;          // the errno of the failed step
 
     bool ok() const { return failedStep.empty(); }
     std::string reason() const;                          // "No such file or directory"

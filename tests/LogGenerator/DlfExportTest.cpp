@@ -8,8 +8,8 @@
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/BuildInfo.h"
 #include "core/platform/Clock.h"
-#include "tests/LogGenerator/RecordingDecoder.h"
 #include "core/platform/SystemLog.h"
+#include "tests/LogGenerator/RecordingDecoder.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -45,8 +45,8 @@ TEST(DlfVersionReport, RecordByteByByte) {
     std::vector<std::uint8_t> expected(161, 0);
     const std::uint8_t header[] = {0xA1, 0x00, 0xFD, 0x1F, 0, 0, 0, 0, 0, 0, 0, 0, 0x01, 0x00, 0x02, 0x00};
     std::memcpy(expected.data(), header, sizeof header);
-    std::memcpy(&expected[16], "Velmar", 6);            // 7-byte field: 6 characters and the NUL
-    std::memcpy(&expected[23], "EXECUTABLE_NAME", 15);  // 15 characters and the NUL, rest of 40 zero
+    std::memcpy(&expected[16], "Velmar", 6);              // 7-byte field: 6 characters and the NUL
+    std::memcpy(&expected[23], "EXECUTABLE_NAME", 15);    // 15 characters and the NUL, rest of 40 zero
     std::memcpy(&expected[63], "Nov 21 2026 18:30", 17);  // 18-byte field: seconds are lost
     const std::uint8_t time[] = {0x04, 0x03, 0x02, 0x01};
     std::memcpy(&expected[81], time, 4);
@@ -68,7 +68,7 @@ TEST(DlfVersionReport, ExecutableNameLongerThanFifteenCharactersIsCut) {
 }
 
 class DlfExportTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override {
         previousTz_ = std::getenv("TZ") ? std::getenv("TZ") : "";
         Clock::setNowForTesting(1'790'000'000.0);
@@ -108,7 +108,8 @@ TEST_F(DlfExportTest, WithoutHistoryTheFileIsTheVersionRecordAlone) {
     EXPECT_EQ(le(&file[14], 2), 1u);
     EXPECT_EQ(std::string(reinterpret_cast<const char*>(&file[16])), "Velmar");
     EXPECT_EQ(std::string(reinterpret_cast<const char*>(&file[23])), "EXECUTABLE_NAME");
-    EXPECT_EQ(std::string(reinterpret_cast<const char*>(&file[63])), BuildInfo::buildDateTime().substr(0, 17));
+    EXPECT_EQ(std::string(reinterpret_cast<const char*>(&file[63])),
+              BuildInfo::buildDateTime().substr(0, 17));
     EXPECT_EQ(le(&file[81], 4), 1'790'000'000u);
     EXPECT_EQ(le(&file[85], 2), 0u);
     EXPECT_EQ(le(&file[87], 2), 0u);
@@ -145,9 +146,11 @@ TEST_F(DlfExportTest, VersionTextIsTruncatedToSixCharactersOrShowsNone) {
     EXPECT_EQ(ORVLogGenerator::dlfVersionText(std::string("1234")), "Velmar 1234");
     EXPECT_EQ(ORVLogGenerator::dlfVersionText(std::nullopt), "(none)");
     generator.version = std::string("1234");
-    EXPECT_EQ(std::string(reinterpret_cast<const char*>(&(*generator.generateDlfFromState(state))[16])), "Velmar");
+    EXPECT_EQ(std::string(reinterpret_cast<const char*>(&(*generator.generateDlfFromState(state))[16])),
+              "Velmar");
     generator.version = std::nullopt;
-    EXPECT_EQ(std::string(reinterpret_cast<const char*>(&(*generator.generateDlfFromState(state))[16])), "(none)");
+    EXPECT_EQ(std::string(reinterpret_cast<const char*>(&(*generator.generateDlfFromState(state))[16])),
+              "(none)");
 }
 
 TEST_F(DlfExportTest, EachHistoryEntryContributesItsBytesAfterTheFirst) {

@@ -11,7 +11,7 @@ namespace {
 using namespace state_keys;
 
 class HistoryTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override { Clock::setNowForTesting(1'700'000'000.0); }
     void TearDown() override { Clock::setNowForTesting(std::nullopt); }
 
@@ -40,7 +40,8 @@ TEST_F(HistoryTest, FirstCallCreatesHistoryWithOneEntry) {
     for (const auto& [key, value] : *entry) {
         keys.push_back(key);
     }
-    EXPECT_EQ(keys, (std::vector<std::string>{"DisplayState", "Display", "ExtraInfo", "Date", "Description"}));
+    EXPECT_EQ(keys,
+              (std::vector<std::string>{"DisplayState", "Display", "ExtraInfo", "Date", "Description"}));
     EXPECT_EQ(*entry->get(kDate).string(), "2023-11-14 22:13:20 +0000");
     EXPECT_EQ(*entry->get(kDescription).string(), "Snapshot (2023-11-14 22:13:20 +0000)");
 }

@@ -1,8 +1,8 @@
 #include <gtest/gtest.h>
 
 #include "LogGenerator/StateKeys.h"
-#include "tests/LogGenerator/RecordingDecoder.h"
 #include "core/platform/SystemLog.h"
+#include "tests/LogGenerator/RecordingDecoder.h"
 #include "tests/support/LogCapture.h"
 
 namespace velmar {
@@ -23,7 +23,7 @@ std::vector<std::uint8_t> packet(std::uint8_t type, std::uint16_t code, std::siz
 }
 
 class IntakeTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override { receivedPackets().clear(); }
     RecordingGenerator generator{"NoSuchTemplate",
                                  {{"Plain", std::vector<std::int32_t>{0xB179, 0x1234}},
@@ -65,7 +65,8 @@ TEST_F(IntakeTest, InvalidLogTypeIsLoggedAndDropped) {
     testing::LogCapture capture;
     generator.updateWithData(packet(2, 0xB179));
     EXPECT_TRUE(receivedPackets().empty());
-    EXPECT_EQ(capture.lines(), (std::vector<testing::LogCapture::Line>{{kLogError, "Invalid log type: 2. Dropping."}}));
+    EXPECT_EQ(capture.lines(),
+              (std::vector<testing::LogCapture::Line>{{kLogError, "Invalid log type: 2. Dropping."}}));
     capture.clear();
     generator.updateWithData(packet(0xAB, 0xB179));
     EXPECT_EQ(capture.texts(), std::vector<std::string>{"Invalid log type: ab. Dropping."});

@@ -84,8 +84,8 @@ TEST(RecordFields, WalkerWritesKeysInTableOrder) {
         written.emplace_back(key, *value.string());
     }
     const std::vector<std::pair<std::string, std::string>> expected{
-        {"ARFCN", "10"}, {"Kept", "yes"}, {"Cell ID", "12345"}, {"RSSI", "-80 dBm"}, {"High nibble", "12"},
-        {"Past the end", "0"}};
+        {"ARFCN", "10"},     {"Kept", "yes"},       {"Cell ID", "12345"},
+        {"RSSI", "-80 dBm"}, {"High nibble", "12"}, {"Past the end", "0"}};
     EXPECT_EQ(written, expected);
 }
 

@@ -23,8 +23,9 @@ inline std::vector<ReceivedPacket>& receivedPackets() {
 }
 
 class RecordingDecoder : public Base {
-public:
-    RecordingDecoder(std::string section, LogCodeArray codes) : section_(std::move(section)), codes_(std::move(codes)) {}
+  public:
+    RecordingDecoder(std::string section, LogCodeArray codes)
+        : section_(std::move(section)), codes_(std::move(codes)) {}
     void updateWithData(ByteView data, std::int32_t logCode) override {
         receivedPackets().push_back({section_, logCode, std::vector<std::uint8_t>(data.begin(), data.end())});
         // Writes the packet length into its section so tests can see that binding worked.
@@ -35,14 +36,14 @@ public:
     std::string_view getSectionName() const override { return section_; }
     LogCodeArray getLogCodeArray() const override { return codes_; }
 
-private:
+  private:
     std::string section_;
     LogCodeArray codes_;
 };
 
 // A class index whose decoders are given as (section, codes) pairs, created in order.
 class RecordingClassIndex : public ClassIndex {
-public:
+  public:
     RecordingClassIndex(std::vector<std::pair<std::string, LogCodeArray>> decoders) {
         for (auto& [section, codes] : decoders) {
             auto decoder = std::make_shared<RecordingDecoder>(section, codes);
@@ -53,9 +54,10 @@ public:
 };
 
 class RecordingGenerator : public ORVLogGenerator2 {
-public:
+  public:
     RecordingGenerator(std::string templateName, std::vector<std::pair<std::string, LogCodeArray>> decoders)
-        : ORVLogGenerator2(std::move(templateName), std::make_shared<RecordingClassIndex>(std::move(decoders))) {}
+        : ORVLogGenerator2(std::move(templateName),
+                           std::make_shared<RecordingClassIndex>(std::move(decoders))) {}
     std::optional<std::string> applicationVersion() const override { return version; }
     std::optional<std::string> version = std::string("1234");
     const PlistDataRef& binData() const { return _binData; }

@@ -5,8 +5,8 @@
 
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/StringFormat.h"
-#include "tests/LogGenerator/RecordingDecoder.h"
 #include "core/platform/SystemLog.h"
+#include "tests/LogGenerator/RecordingDecoder.h"
 #include "tests/support/LogCapture.h"
 #include "tests/support/TestPaths.h"
 
@@ -40,7 +40,7 @@ constexpr const char* kTemplateText = R"(<?xml version="1.0" encoding="UTF-8"?>
 )";
 
 class TemplateDisplayTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override {
         previousResourceDir_ = std::getenv("VELMAR_RESOURCE_DIR") ? std::getenv("VELMAR_RESOURCE_DIR") : "";
         setenv("VELMAR_RESOURCE_DIR", resources_.path().c_str(), 1);
@@ -98,7 +98,13 @@ TEST_F(TemplateDisplayTest, SectionKeysBindDecodersWhereverTheyStand) {
     generator.updateState(state, packet(2));
     generator.updateState(state, packet(3));
     EXPECT_EQ(testing::receivedPackets().size(), 3u);
-    EXPECT_TRUE(state->get(kDisplay).dictionary()->get("Lists").array()->at(1).dictionary()->get("Neighbours")
+    EXPECT_TRUE(state->get(kDisplay)
+                    .dictionary()
+                    ->get("Lists")
+                    .array()
+                    ->at(1)
+                    .dictionary()
+                    ->get("Neighbours")
                     .isArray());
 }
 
@@ -149,10 +155,11 @@ TEST_F(TemplateDisplayTest, BuildingTheTreeLogsItsDiagnostics) {
     RecordingGenerator generator("Test", {{"Serving", std::vector<std::int32_t>{1}}});
     testing::LogCapture capture;
     generator.getDisplayFromState(state);
-    const std::string initialized = stringWithFormat("Initialized class index: %p, Self: %p",
-                                                     static_cast<const void*>(generator.classIndex()),
-                                                     static_cast<void*>(&generator));
-    EXPECT_EQ(capture.texts(), (std::vector<std::string>{initialized, "Dictionary = 1", "String = 0", "Serving"}));
+    const std::string initialized =
+        stringWithFormat("Initialized class index: %p, Self: %p",
+                         static_cast<const void*>(generator.classIndex()), static_cast<void*>(&generator));
+    EXPECT_EQ(capture.texts(),
+              (std::vector<std::string>{initialized, "Dictionary = 1", "String = 0", "Serving"}));
     capture.clear();
     generator.getDisplayFromState(state);
     EXPECT_TRUE(capture.lines().empty());

@@ -6,7 +6,7 @@ namespace velmar {
 namespace {
 
 class ArrayLockTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override { ArrayLock::releaseOutstandingForTesting(); }
     void TearDown() override { ArrayLock::releaseOutstandingForTesting(); }
 };

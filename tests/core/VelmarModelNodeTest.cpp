@@ -15,7 +15,9 @@ PlistValue dictionaryOf(std::initializer_list<std::pair<const char*, PlistValue>
     return dictionary;
 }
 
-PlistValue arrayOf(std::initializer_list<PlistValue> elements) { return PlistArray::create(elements); }
+PlistValue arrayOf(std::initializer_list<PlistValue> elements) {
+    return PlistArray::create(elements);
+}
 
 std::vector<std::string> childNames(const VelmarModelNode& node) {
     std::vector<std::string> names;
@@ -26,7 +28,7 @@ std::vector<std::string> childNames(const VelmarModelNode& node) {
 }
 
 class VelmarModelNodeTest : public ::testing::Test {
-protected:
+  protected:
     void TearDown() override { ArrayLock::releaseOutstandingForTesting(); }
     NodePathDictionary paths;
 };
@@ -75,7 +77,8 @@ TEST_F(VelmarModelNodeTest, UnsortedDictionaryShowsKeyWholeInItsOwnOrder) {
 }
 
 TEST_F(VelmarModelNodeTest, ArrayChildrenAreNamedByIndex) {
-    auto root = VelmarModelNode::makeTreeFromObject(dictionaryOf({{"List", arrayOf({"a", "b", "c"})}}), paths);
+    auto root =
+        VelmarModelNode::makeTreeFromObject(dictionaryOf({{"List", arrayOf({"a", "b", "c"})}}), paths);
     const auto& list = root->childNodes()->at(0);
     EXPECT_EQ(childNames(*list), (std::vector<std::string>{"0", "1", "2"}));
     EXPECT_TRUE(paths.contains("/List/0"));
@@ -85,12 +88,11 @@ TEST_F(VelmarModelNodeTest, ArrayChildrenAreNamedByIndex) {
 }
 
 TEST_F(VelmarModelNodeTest, NonTextValuesAreShownAsUnknown) {
-    auto root = VelmarModelNode::makeTreeFromObject(
-        dictionaryOf({{"Number", PlistValue::integer(7)},
-                      {"Flag", PlistValue::boolean(true)},
-                      {"Bytes", PlistValue::data({1, 2})},
-                      {"When", PlistValue::date({0})}}),
-        paths);
+    auto root = VelmarModelNode::makeTreeFromObject(dictionaryOf({{"Number", PlistValue::integer(7)},
+                                                                  {"Flag", PlistValue::boolean(true)},
+                                                                  {"Bytes", PlistValue::data({1, 2})},
+                                                                  {"When", PlistValue::date({0})}}),
+                                                    paths);
     for (const char* path : {"/Number", "/Flag", "/Bytes", "/When"}) {
         const auto* node = paths.find(path);
         ASSERT_NE(node, nullptr) << path;
@@ -113,7 +115,8 @@ TEST_F(VelmarModelNodeTest, PathDictionaryHoldsEveryNodeIncludingRoot) {
 }
 
 TEST_F(VelmarModelNodeTest, InnerNodeIsRecognisedByChildNodesAlone) {
-    auto root = VelmarModelNode::makeTreeFromObject(dictionaryOf({{"Empty", PlistValue::newDictionary()}}), paths);
+    auto root =
+        VelmarModelNode::makeTreeFromObject(dictionaryOf({{"Empty", PlistValue::newDictionary()}}), paths);
     const auto& empty = root->childNodes()->at(0);
     EXPECT_NE(empty->childNodes(), nullptr);
     EXPECT_EQ(empty->value(), nullptr);
@@ -125,8 +128,8 @@ TEST_F(VelmarModelNodeTest, NameWithSlashBecomesFurtherPathComponents) {
 }
 
 TEST_F(VelmarModelNodeTest, LaterNodeWithSamePathReplacesEarlier) {
-    VelmarModelNode::makeTreeFromObject(dictionaryOf({{"a/b", "first"}, {"a", dictionaryOf({{"b", "second"}})}}),
-                                        paths);
+    VelmarModelNode::makeTreeFromObject(
+        dictionaryOf({{"a/b", "first"}, {"a", dictionaryOf({{"b", "second"}})}}), paths);
     EXPECT_EQ(*(*paths.find("/a/b"))->value(), "second");
 }
 

@@ -21,7 +21,7 @@ using testing::FakeTelephonyService;
 
 // A generator that counts blobs and shows the count.
 class CountingGenerator : public MonitorGenerator {
-public:
+  public:
     void updateState(const PlistDictionaryRef& state, ByteView data) override {
         ++blobs;
         state->set("Last length", std::to_string(data.size()));
@@ -30,7 +30,8 @@ public:
         ++refreshes;
         auto display = PlistDictionary::create();
         display->set("Blobs", std::to_string(blobs));
-        display->set("Last length", state->get("Last length").string() ? *state->get("Last length").string() : "-");
+        display->set("Last length",
+                     state->get("Last length").string() ? *state->get("Last length").string() : "-");
         auto cell = PlistDictionary::create();
         cell->set("PCI", "101");
         display->set("Cell", cell);
@@ -48,13 +49,13 @@ public:
 };
 
 class RedrawCounter : public VelmarModelDelegate {
-public:
+  public:
     void updateViewControllerFromModel() override { ++redraws; }
     int redraws = 0;
 };
 
 class VelmarModelTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override {
         setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
         MainQueue::setCurrent(&queue_);
@@ -143,7 +144,8 @@ TEST_F(VelmarModelTest, ReplyWithoutTheAnswerConfiguresNothing) {
 }
 
 TEST_F(VelmarModelTest, ReplyThatIsNotAPropertyListIsReported) {
-    FakeTelephonyService service({.technologyReply = FakeTelephonyService::TechnologyReply::NotAPropertyList});
+    FakeTelephonyService service(
+        {.technologyReply = FakeTelephonyService::TechnologyReply::NotAPropertyList});
     testing::LogCapture capture;
     model().restartMonitor();
     EXPECT_TRUE(capture.contains(" ***** Could not parse reply to GetTechnology; cannot configure"));
@@ -161,8 +163,8 @@ TEST_F(VelmarModelTest, ServiceThatNeverAnswersTimesOutAfterOneSecond) {
     FakeTelephonyService service({.technologyReply = FakeTelephonyService::TechnologyReply::Stall});
     testing::LogCapture capture;
     model().restartMonitor();
-    EXPECT_TRUE(capture.contains(
-        stringWithFormat(" ***** Could not send the GetTechnology command (got error=%d)", kMessagePortReceiveTimeout)));
+    EXPECT_TRUE(capture.contains(stringWithFormat(
+        " ***** Could not send the GetTechnology command (got error=%d)", kMessagePortReceiveTimeout)));
     EXPECT_FALSE(model().isRunning());
 }
 

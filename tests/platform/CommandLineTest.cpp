@@ -169,8 +169,11 @@ TEST(CommandLine, HelpWinsOverEverythingElse) {
 TEST(CommandLine, VersionWinsOverEverythingButHelp) {
     Sample sample;
     const CommandLine commandLine = sampleCommandLine(sample, true);
-    for (const std::vector<std::string>& arguments : std::vector<std::vector<std::string>>{
-             {"--version"}, {"--bogus", "--version"}, {"--speed", "0", "--version"}, {"a.hex", "--version"}}) {
+    for (const std::vector<std::string>& arguments :
+         std::vector<std::vector<std::string>>{{"--version"},
+                                               {"--bogus", "--version"},
+                                               {"--speed", "0", "--version"},
+                                               {"a.hex", "--version"}}) {
         const CommandLineResult result = parseCommandLine(commandLine, arguments);
         EXPECT_TRUE(result.version) << arguments.front();
         EXPECT_FALSE(result.help) << arguments.front();

@@ -17,7 +17,8 @@ TEST(Json, EveryKindOnOneLine) {
     dictionary->set("no", PlistValue::boolean(false));
     dictionary->set("bytes", PlistValue::data({0x01, 0x02, 0xFF}));
     dictionary->set("when", PlistValue::date({1700000000.0}));
-    dictionary->set("list", PlistArray::create({PlistValue("x"), PlistValue::newDictionary(), PlistValue::newArray()}));
+    dictionary->set(
+        "list", PlistArray::create({PlistValue("x"), PlistValue::newDictionary(), PlistValue::newArray()}));
     dictionary->set("none", PlistValue());
     EXPECT_EQ(plistToJson(dictionary),
               R"({"b": "text", "a": -42, "real": 2.5, "yes": true, "no": false, "bytes": {"$data": "AQL/"}, )"

@@ -9,7 +9,9 @@
 namespace velmar::testing {
 
 namespace {
-PlistData encode(const PlistValue& value) { return serializeXml(value).value_or(PlistData()); }
+PlistData encode(const PlistValue& value) {
+    return serializeXml(value).value_or(PlistData());
+}
 }  // namespace
 
 FakeTelephonyService::FakeTelephonyService() : FakeTelephonyService(Behaviour{}) {}
@@ -110,7 +112,8 @@ std::optional<PlistData> FakeTelephonyService::onControl(ByteView data) {
     reply->set(kKxDomainKey, PlistValue::integer(kKxErrorDomainServer));
     const std::string* receivePort = fields ? fields->get(kKxReceivePortKey).string() : nullptr;
     if (behaviour_.channelError != 0 || receivePort == nullptr) {
-        reply->set(kKxErrorKey, PlistValue::integer(behaviour_.channelError != 0 ? behaviour_.channelError : 1));
+        reply->set(kKxErrorKey,
+                   PlistValue::integer(behaviour_.channelError != 0 ? behaviour_.channelError : 1));
         return encode(reply);
     }
     client_ = MessagePort::createRemote(*receivePort);

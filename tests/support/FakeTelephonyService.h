@@ -1,7 +1,8 @@
 // FakeTelephonyService: a telephony service for the model's tests, built on the same port library, running on
-// its own thread and main queue. It can behave well or badly: answer "GetTechnology" with any technology, with
-// a dictionary lacking the answer, with bytes that are not a property list, or not at all; refuse channels;
-// answer an empty port name; send blobs with any message id; and close a channel as a dying service would.
+// its own thread and main queue. It can behave well or badly: answer "GetTechnology" with any technology,
+// with a dictionary lacking the answer, with bytes that are not a property list, or not at all; refuse
+// channels; answer an empty port name; send blobs with any message id; and close a channel as a dying service
+// would.
 #pragma once
 
 #include <atomic>
@@ -20,7 +21,7 @@
 namespace velmar::testing {
 
 class FakeTelephonyService {
-public:
+  public:
     enum class TechnologyReply { Answer, NoAnswerKey, NotAPropertyList, EmptyReply, Stall };
 
     struct Behaviour {
@@ -44,7 +45,7 @@ public:
     // Waits until predicate holds or the time is up (the predicate may call the other members).
     bool waitFor(const std::function<bool()>& predicate, double seconds);
 
-private:
+  private:
     void runOnServiceThread(std::function<void()> task);
     std::optional<PlistData> onControl(ByteView data);
     std::optional<PlistData> onChannel(ByteView data);

@@ -10,7 +10,7 @@ namespace velmar::testing {
 namespace {
 
 class JsonReader {
-public:
+  public:
     explicit JsonReader(std::string_view text) : text_(text) {}
 
     std::optional<PlistValue> document() {
@@ -22,7 +22,7 @@ public:
         return value;
     }
 
-private:
+  private:
     void skipSpace() {
         while (at_ < text_.size() && std::isspace(static_cast<unsigned char>(text_[at_]))) {
             ++at_;
@@ -97,14 +97,30 @@ private:
             }
             const char escape = text_[at_++];
             switch (escape) {
-                case '"': out.push_back('"'); break;
-                case '\\': out.push_back('\\'); break;
-                case '/': out.push_back('/'); break;
-                case 'b': out.push_back('\b'); break;
-                case 'f': out.push_back('\f'); break;
-                case 'n': out.push_back('\n'); break;
-                case 'r': out.push_back('\r'); break;
-                case 't': out.push_back('\t'); break;
+                case '"':
+                    out.push_back('"');
+                    break;
+                case '\\':
+                    out.push_back('\\');
+                    break;
+                case '/':
+                    out.push_back('/');
+                    break;
+                case 'b':
+                    out.push_back('\b');
+                    break;
+                case 'f':
+                    out.push_back('\f');
+                    break;
+                case 'n':
+                    out.push_back('\n');
+                    break;
+                case 'r':
+                    out.push_back('\r');
+                    break;
+                case 't':
+                    out.push_back('\t');
+                    break;
                 case 'u': {
                     auto code = hex4();
                     if (!code) {
@@ -228,6 +244,8 @@ private:
 
 }  // namespace
 
-std::optional<PlistValue> parseJson(std::string_view text) { return JsonReader(text).document(); }
+std::optional<PlistValue> parseJson(std::string_view text) {
+    return JsonReader(text).document();
+}
 
 }  // namespace velmar::testing

@@ -8,7 +8,7 @@
 namespace velmar::testing {
 
 class LogCapture {
-public:
+  public:
     struct Line {
         int priority;
         std::string text;
@@ -28,7 +28,7 @@ public:
     bool contains(const std::string& text) const;
     void clear() { lines_.clear(); }
 
-private:
+  private:
     std::vector<Line> lines_;
     int previousThreshold_;
 };

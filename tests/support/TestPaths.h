@@ -9,7 +9,7 @@ namespace velmar::testing {
 std::string testDataPath(const std::string& name);
 // A new empty directory under the system's temporary directory, removed with its contents on destruction.
 class TemporaryDirectory {
-public:
+  public:
     TemporaryDirectory();
     ~TemporaryDirectory();
     TemporaryDirectory(const TemporaryDirectory&) = delete;
@@ -17,7 +17,7 @@ public:
     const std::string& path() const { return path_; }
     std::string file(const std::string& name) const { return path_ + "/" + name; }
 
-private:
+  private:
     std::string path_;
 };
 

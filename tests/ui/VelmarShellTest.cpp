@@ -18,7 +18,7 @@ namespace velmar {
 namespace {
 
 class RecordingPane : public Pane {
-public:
+  public:
     explicit RecordingPane(std::string path) : path_(std::move(path)) {}
     const std::string& path() const override { return path_; }
     void reloadWithNode(const VelmarModelNodeRef& node) override {
@@ -39,12 +39,12 @@ public:
     bool loading_ = false;
     int reloads = 0;
 
-private:
+  private:
     std::string path_;
 };
 
 class RecordingStack : public NavigationStack {
-public:
+  public:
     explicit RecordingStack(std::vector<std::string> paths) {
         for (auto& path : paths) {
             panes.push_back(std::make_unique<RecordingPane>(path));
@@ -65,7 +65,7 @@ public:
 
 // Shows {"Cell": {"PCI": "101", "Neighbours": {"A": "1"}}} until told to drop the neighbours.
 class ShrinkingGenerator : public MonitorGenerator {
-public:
+  public:
     void updateState(const PlistDictionaryRef&, ByteView) override { ++blobs; }
     PlistValue generateLogUsingState(const PlistDictionaryRef&) override {
         auto cell = PlistDictionary::create();
@@ -90,7 +90,7 @@ public:
 };
 
 class VelmarShellTest : public ::testing::Test {
-protected:
+  protected:
     void SetUp() override {
         setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
         setenv("XDG_CONFIG_HOME", config_.path().c_str(), 1);

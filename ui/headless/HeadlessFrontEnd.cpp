@@ -17,7 +17,8 @@ namespace {
 // "YYYY-MM-DDTHH:MM:SS±HH:MM" in local time.
 std::string isoLocalTime(double secondsSince1970) {
     const std::string stamp = Clock::localText(secondsSince1970, "%Y-%m-%dT%H:%M:%S");
-    const long offset = Clock::localZoneAt(static_cast<std::int64_t>(std::floor(secondsSince1970))).utcOffsetSeconds;
+    const long offset =
+        Clock::localZoneAt(static_cast<std::int64_t>(std::floor(secondsSince1970))).utcOffsetSeconds;
     const long minutes = (offset < 0 ? -offset : offset) / 60;
     char zone[48];
     std::snprintf(zone, sizeof zone, "%c%02ld:%02ld", offset < 0 ? '-' : '+', minutes / 60, minutes % 60);
@@ -51,7 +52,8 @@ std::shared_ptr<const std::string> normalisedPath(const std::string& followed,
 
 }  // namespace
 
-HeadlessFrontEnd::HeadlessFrontEnd(GeneratorFactory factory, const std::string& followedPath, std::FILE* output)
+HeadlessFrontEnd::HeadlessFrontEnd(GeneratorFactory factory, const std::string& followedPath,
+                                   std::FILE* output)
     : shell_(std::move(factory), queue_), output_(output) {
     MainQueue::setCurrent(&queue_);
     std::vector<std::size_t> ends;
@@ -63,7 +65,9 @@ HeadlessFrontEnd::HeadlessFrontEnd(GeneratorFactory factory, const std::string& 
     shell_.setRedrawObserver([this] { printStatusLine(); });
 }
 
-HeadlessFrontEnd::~HeadlessFrontEnd() { MainQueue::setCurrent(nullptr); }
+HeadlessFrontEnd::~HeadlessFrontEnd() {
+    MainQueue::setCurrent(nullptr);
+}
 
 void HeadlessFrontEnd::popToPane(std::size_t index, bool) {
     if (index + 1 < panes_.size()) {

@@ -3,9 +3,10 @@
 // Contract: the navigation stack holds the root pane and, with a followed path /A/B, the panes /A and /A/B
 // above it, as if the user had opened them. After launch and after every redraw one JSON line goes to the
 // output: {"time": "<ISO 8601 local>", "connected": true|false, "status": "<status text>", "tree": NODE},
-// where NODE is the top pane's node, {"name": N, "value": V} for a leaf and {"name": N, "children": [NODE...]}
-// for an inner node, in display order, and null without a tree. A pane whose path has gone is popped, so the
-// top pane, and the tree printed, become its parent's. SIGTERM and SIGINT run the termination sequence.
+// where NODE is the top pane's node, {"name": N, "value": V} for a leaf and {"name": N, "children":
+// [NODE...]} for an inner node, in display order, and null without a tree. A pane whose path has gone is
+// popped, so the top pane, and the tree printed, become its parent's. SIGTERM and SIGINT run the termination
+// sequence.
 #pragma once
 
 #include <cstdio>
@@ -23,15 +24,15 @@ namespace velmar {
 // the panes share, made into a string of its own only when asked for; so a path of any number of parts costs
 // memory in proportion to its length, not to its length squared.
 class HeadlessPane : public Pane {
-public:
-  HeadlessPane(std::shared_ptr<const std::string> followed, std::size_t length)
-      : followed_(std::move(followed)), length_(length) {}
-  const std::string& path() const override {
-      if (path_.empty()) {
-          path_ = followed_->substr(0, length_);
-      }
-      return path_;
-  }
+  public:
+    HeadlessPane(std::shared_ptr<const std::string> followed, std::size_t length)
+        : followed_(std::move(followed)), length_(length) {}
+    const std::string& path() const override {
+        if (path_.empty()) {
+            path_ = followed_->substr(0, length_);
+        }
+        return path_;
+    }
     void reloadWithNode(const VelmarModelNodeRef& node) override { node_ = node; }
     void setStatus(const std::string& status, bool isLoading) override {
         status_ = status;
@@ -41,17 +42,17 @@ public:
     const std::string& status() const { return status_; }
     bool isLoading() const { return loading_; }
 
-private:
-  std::shared_ptr<const std::string> followed_;
-  std::size_t length_;
-  mutable std::string path_;
-  VelmarModelNodeRef node_;
-  std::string status_;
-  bool loading_ = false;
+  private:
+    std::shared_ptr<const std::string> followed_;
+    std::size_t length_;
+    mutable std::string path_;
+    VelmarModelNodeRef node_;
+    std::string status_;
+    bool loading_ = false;
 };
 
 class HeadlessFrontEnd : public NavigationStack {
-public:
+  public:
     HeadlessFrontEnd(GeneratorFactory factory, const std::string& followedPath, std::FILE* output);
     ~HeadlessFrontEnd() override;
 
@@ -67,7 +68,7 @@ public:
     // The JSON form of one node, as the line carries it.
     static void appendNodeJson(std::string& out, const VelmarModelNodeRef& node);
 
-private:
+  private:
     void printStatusLine();
 
     PollMainQueue queue_;

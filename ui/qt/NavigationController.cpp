@@ -174,7 +174,7 @@ void NavigationController::popToPane(std::size_t index, bool animated) {
     NavigationScreen* outgoing = topScreen();
     outgoing->viewWillDisappear();
     std::vector<NavigationScreen*> discarded(panes_.begin() + static_cast<std::ptrdiff_t>(index) + 1,
-                                                 panes_.end());
+                                             panes_.end());
     panes_.resize(index + 1);
     NavigationScreen* incoming = topScreen();
     incoming->viewWillAppear();

@@ -5,9 +5,9 @@
 
 #include "core/ValueHistory.h"
 #include "ui/qt/NavigationController.h"
-#include "ui/qt/VelmarChartController.h"
 #include "ui/qt/VelmarApp.h"
 #include "ui/qt/VelmarCell.h"
+#include "ui/qt/VelmarChartController.h"
 
 namespace velmar {
 
@@ -137,8 +137,7 @@ void VelmarPaneController::didLongPressRow(TableView&, int row) {
     if (child == nullptr || !isNumericLeaf(child->get())) {
         return;  // only a number has a chart
     }
-    pushChart(ChartKind::Value, *child,
-              joinDisplayPath(_keyPath, (*child)->displayName()));
+    pushChart(ChartKind::Value, *child, joinDisplayPath(_keyPath, (*child)->displayName()));
 }
 
 void VelmarPaneController::pushChart(ChartKind kind, const VelmarModelNodeRef& node, std::string path) {

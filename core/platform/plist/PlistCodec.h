@@ -2,8 +2,8 @@
 //
 // Contract:
 // - serializeXml writes the XML encoding (version "1.0", tab indentation, the standard header and document
-//   type; data as base64 lines of at most 76 characters; dates to the whole second). It fails (nullopt), never
-//   producing a partial document, when the value is not a property list XML can carry: a none value
+//   type; data as base64 lines of at most 76 characters; dates to the whole second). It fails (nullopt),
+//   never producing a partial document, when the value is not a property list XML can carry: a none value
 //   anywhere, a string or key that is not valid UTF-8 or holds a character XML cannot carry (control
 //   characters other than tab, line feed and carriage return; U+FFFE, U+FFFF), a date outside the years
 //   0000 to 9999, or nesting deeper than kMaxPlistDepth (which also stops a tree that contains itself).
@@ -32,7 +32,8 @@ inline constexpr int kMaxPlistDepth = 512;
 std::optional<PlistData> serializeXml(const PlistValue& value);
 bool writeXmlFile(const PlistValue& dictionary, const std::string& path);
 
-std::optional<PlistValue> parsePropertyList(std::span<const std::uint8_t> bytes, std::string* error = nullptr);
+std::optional<PlistValue> parsePropertyList(std::span<const std::uint8_t> bytes,
+                                            std::string* error = nullptr);
 std::optional<PlistValue> readDictionaryFile(const std::string& path, std::string* error = nullptr);
 
 std::optional<PlistData> serializeBinary(const PlistValue& value);

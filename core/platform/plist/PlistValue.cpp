@@ -44,14 +44,20 @@ PlistValue PlistValue::boolean(bool flag) {
     v.value_ = flag;
     return v;
 }
-PlistValue PlistValue::data(PlistData bytes) { return PlistValue(std::make_shared<PlistData>(std::move(bytes))); }
+PlistValue PlistValue::data(PlistData bytes) {
+    return PlistValue(std::make_shared<PlistData>(std::move(bytes)));
+}
 PlistValue PlistValue::date(PlistDate instant) {
     PlistValue v;
     v.value_ = instant;
     return v;
 }
-PlistValue PlistValue::newDictionary() { return PlistValue(PlistDictionary::create()); }
-PlistValue PlistValue::newArray() { return PlistValue(PlistArray::create()); }
+PlistValue PlistValue::newDictionary() {
+    return PlistValue(PlistDictionary::create());
+}
+PlistValue PlistValue::newArray() {
+    return PlistValue(PlistArray::create());
+}
 
 const PlistDictionaryRef& PlistValue::dictionary() const {
     const auto* held = std::get_if<PlistDictionaryRef>(&value_);
@@ -61,7 +67,9 @@ const PlistArrayRef& PlistValue::array() const {
     const auto* held = std::get_if<PlistArrayRef>(&value_);
     return held ? *held : kNoArray;
 }
-const std::string* PlistValue::string() const { return std::get_if<std::string>(&value_); }
+const std::string* PlistValue::string() const {
+    return std::get_if<std::string>(&value_);
+}
 std::optional<std::int64_t> PlistValue::integerValue() const {
     const auto* held = std::get_if<std::int64_t>(&value_);
     return held ? std::optional<std::int64_t>(*held) : std::nullopt;
@@ -84,8 +92,8 @@ std::optional<PlistDate> PlistValue::dateValue() const {
 }
 
 std::string_view PlistValue::typeName() const {
-    static constexpr std::string_view kNames[] = {"none",    "dictionary", "array",   "string", "integer",
-                                                  "real",    "boolean",    "data",    "date"};
+    static constexpr std::string_view kNames[] = {"none", "dictionary", "array", "string", "integer",
+                                                  "real", "boolean",    "data",  "date"};
     return kNames[value_.index()];
 }
 

@@ -1,4 +1,5 @@
-// PlistValue: one property-list value (dictionary, array, string, integer, real, boolean, data, date) or none.
+// PlistValue: one property-list value (dictionary, array, string, integer, real, boolean, data, date) or
+// none.
 //
 // Contract: dictionaries, arrays and data are held by shared reference, so copying a PlistValue shares the
 // container (a shallow copy) exactly as the monitor's state dictionary expects: a history entry made from a
@@ -34,7 +35,7 @@ struct PlistDate {
 };
 
 class PlistValue {
-public:
+  public:
     enum class Kind : std::uint8_t { None, Dictionary, Array, String, Integer, Real, Boolean, Data, Date };
 
     PlistValue() noexcept = default;
@@ -88,7 +89,7 @@ public:
     // Deep structural equality (containers compared by content, dictionaries in order).
     bool operator==(const PlistValue& other) const;
 
-private:
+  private:
     std::variant<std::monostate, PlistDictionaryRef, PlistArrayRef, std::string, std::int64_t, double, bool,
                  PlistDataRef, PlistDate>
         value_;
@@ -96,7 +97,7 @@ private:
 
 // A mutable, insertion-ordered dictionary of string keys.
 class PlistDictionary {
-public:
+  public:
     using Entry = std::pair<std::string, PlistValue>;
 
     static PlistDictionaryRef create() { return std::make_shared<PlistDictionary>(); }
@@ -118,13 +119,13 @@ public:
     auto begin() const { return map_.begin(); }
     auto end() const { return map_.end(); }
 
-private:
+  private:
     InsertionOrderedMap<PlistValue> map_;
 };
 
 // A mutable array of values.
 class PlistArray {
-public:
+  public:
     static PlistArrayRef create() { return std::make_shared<PlistArray>(); }
     static PlistArrayRef create(std::vector<PlistValue> items);
 
@@ -142,7 +143,7 @@ public:
     auto begin() const { return items_.begin(); }
     auto end() const { return items_.end(); }
 
-private:
+  private:
     std::vector<PlistValue> items_;
 };
 
