@@ -4,10 +4,11 @@ SHELL := /bin/bash
 
 # The Debian packages the project builds and tests with. Qt Charts' CMake package needs Qt OpenGL's, which
 # qt6-charts-dev does not pull in by itself. lintian checks the .deb; systemd brings systemd-analyze, which
-# checks the user unit; clang-format checks the sources' style.
+# checks the user unit; clang-format checks the sources' style. The service reads ModemManager through sd-bus
+# (libsystemd-dev); its tests run a private dbus-daemon.
 DEBIAN_PACKAGES := build-essential cmake pkg-config clang libclang-rt-14-dev qt6-base-dev qt6-charts-dev \
                    libqt6opengl6-dev libexpat1-dev libncurses-dev googletest libgtest-dev libbenchmark-dev \
-                   tmux lintian systemd clang-format
+                   tmux lintian systemd clang-format libsystemd-dev dbus-daemon
 SUDO := $(shell [ "$$(id -u)" = 0 ] || echo sudo)
 FUZZ_SECONDS ?= 30
 DEMO_TECHNOLOGY ?= lte
