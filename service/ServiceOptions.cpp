@@ -32,8 +32,11 @@ struct OptionScope {
     bool live;
 };
 
-constexpr std::array<OptionScope, 10> kScopes = {{
+constexpr std::array<OptionScope, 13> kScopes = {{
     {"--input", false, true, false},
+    {"--modem-manager", false, false, true},
+    {"--modem", false, false, true},
+    {"--bus-address", false, false, true},
     {"--device", false, false, true},
     {"--subscription", false, false, true},
     {"--record", false, false, true},
@@ -289,6 +292,36 @@ CommandLine serviceCommandLine(ServiceOptions& options) {
              "live: also write every frame from the port, as received, to FILE (a raw capture, mode 0600, "
              "that --source replay and velmar-decode read)",
          .apply = storesValue(options.record)},
+        {.name = "--modem-manager",
+         .value = "on|off",
+         .help = "live: read the SIM's identities, the cells the modem sees and its connected bearers from "
+                 "ModemManager on the system bus and stream them as the SIM files, cell-monitor and "
+                 "packet-data context records (default on). Without a bus, ModemManager or a modem the "
+                 "service says so once and goes on without them; they are picked up when they appear",
+         .apply = [&options](std::string_view value) -> std::string {
+             if (value != "on" && value != "off") {
+                 return "--modem-manager needs on or off, not " + quoted(value);
+             }
+             options.modemManager = value == "on";
+             return "";
+         }},
+        {.name = "--modem",
+         .value = "OBJECT-PATH|INDEX",
+         .help = "live: the ModemManager modem to read, by object path or by the number that ends it "
+                 "(default: the modem that owns the diagnostic port, else the only one)",
+         .apply = [&options](std::string_view value) -> std::string {
+             const bool path = value.starts_with('/');
+             if (!path && !parseUnsigned(value)) {
+                 return "--modem needs an object path or an index, not " + quoted(value);
+             }
+             options.modem = std::string(value);
+             return "";
+         }},
+        {.name = "--bus-address",
+         .value = "ADDRESS",
+         .help = "live: a test and debugging aid: the D-Bus address (\"unix:path=/run/example.sock\") where "
+                 "ModemManager is looked for instead of the system bus (DBUS_SYSTEM_BUS_ADDRESS when set)",
+         .apply = storesValue(options.busAddress)},
         {.name = "--list-devices",
          .value = "",
          .help = "probe the USB serial ports that may be a diagnostic port, print one line each (tty, by-id "

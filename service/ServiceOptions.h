@@ -3,11 +3,13 @@
 //   kxserverd [--source sim|replay|live] [--technology gsm|lte|utran|cdma|ifx] [--input FILE]
 //             [--speed X | --fast] [--loop] [--seed N] [--device PATH] [--log-stderr]
 //             [--scenario drive|walk|static] [--rate-multiplier X] [--max-channels N]
-//             [--max-connections N] [--queue-memory MIB] [--subscription N] [--record FILE] | --list-devices
+//             [--max-connections N] [--queue-memory MIB] [--subscription N] [--record FILE]
+//             [--modem-manager on|off] [--modem OBJECT-PATH|INDEX] [--bus-address ADDRESS] | --list-devices
 //
 // Contract: parseServiceOptions reads the arguments after the program name with the one command-line parser
 // (core/platform/CommandLine.h: "--name value" or "--name=value", --help anywhere wins, then --version).
-// It answers the options, or help, or the version, or a one-line usage error: an unknown option or value, a missing value, a bad number,
+// It answers the options, or help, or the version, or a one-line usage error: an unknown option or value, a
+// missing value, a bad number,
 // --speed with --fast, a source without its input, or an option that does not apply to the chosen source.
 // --list-devices asks for the listing of diagnostic ports instead of a service: it needs no source.
 #pragma once
@@ -31,6 +33,9 @@ struct ServiceOptions {
     std::string device;                         // live: a path, or "auto"
     std::optional<std::uint32_t> subscription;  // live: the streaming subscription; none: the lowest seen
     std::string record;                         // live: the raw capture to write; empty: none
+    bool modemManager = true;                   // live: the extra records from ModemManager
+    std::string modem;                          // live: ModemManager's modem (path or index); empty: default
+    std::string busAddress;                     // live: where ModemManager is looked for; empty: system bus
     bool listDevices = false;
     double speed = 1.0;
     bool fast = false;

@@ -46,6 +46,13 @@ LiveSource::Settings liveSettings(const ServiceOptions& options) {
         secondsFromEnvironment("VELMAR_DIAG_KEEPALIVE_SECONDS", settings.timing.keepAliveSeconds);
     settings.retrySeconds = secondsFromEnvironment("VELMAR_DIAG_RETRY_SECONDS", settings.retrySeconds);
     settings.deviceRoot = live::deviceRoot();
+    if (options.modemManager) {
+        modem::ModemManagerLink::Settings link;
+        link.busAddress = options.busAddress;
+        link.modem = options.modem;
+        link.retrySeconds = secondsFromEnvironment("VELMAR_MODEM_MANAGER_RETRY_SECONDS", link.retrySeconds);
+        settings.modemManager = link;
+    }
     return settings;
 }
 

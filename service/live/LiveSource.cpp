@@ -82,6 +82,13 @@ void LiveSource::start(MainQueue& queue, BlobSink& sink) {
             onDemandChanged();
         }
     });
+    if (settings_.modemManager && !modemManager_) {
+        modemManager_ = std::make_unique<modem::ModemManagerLink>(
+            *settings_.modemManager, queue, sink, [this] { return port_ ? portName_ : std::string(); });
+    }
+    if (modemManager_) {
+        modemManager_->start();
+    }
     if (port_) {
         usePort(std::move(port_));
     } else {
@@ -217,6 +224,9 @@ void LiveSource::deliverLogPacket(ByteView blob) {
 void LiveSource::onDemandChanged() {
     if (session_ && !finishing_) {
         session_->setDemand(sink_->streamingDemand());
+    }
+    if (modemManager_) {
+        modemManager_->demandChanged();
     }
 }
 
@@ -360,6 +370,9 @@ void LiveSource::stop() {
     retryTimer_ = 0;
     if (sink_ != nullptr) {
         sink_->observeStreamingDemand(nullptr);
+    }
+    if (modemManager_) {
+        modemManager_->stop();
     }
     if (session_) {
         session_->stopNow();  // nothing when finish() has told the device already

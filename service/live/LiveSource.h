@@ -22,6 +22,8 @@
 //   longer than kMaxDiagResponseBytes are counted as bad (the first few of each kDamageReportInterval are
 //   described, the others summed up). Bytes are read kReadSize at a time, at most
 //   kReadsPerWake reads per wake-up, so a flood never starves the channels and the control port.
+// - With Settings::modemManager, a ModemManagerLink supplies the extra records beside the port, told of the
+//   port in use (to find its modem) and of every change of the channels' demand.
 // - finish(done) sends the stop sequence (logging off) and runs done; stop() closes everything, writing the
 //   stop sequence at once if finish() did not run.
 #pragma once
@@ -40,6 +42,7 @@
 #include "service/live/DiagPort.h"
 #include "service/live/DiagSession.h"
 #include "service/live/SubscriptionSelector.h"
+#include "service/modem-manager/ModemManagerLink.h"
 
 namespace velmar {
 
@@ -54,6 +57,8 @@ class LiveSource : public BasebandSource, private live::DiagSession::Listener, p
         live::DiagTiming timing;
         double retrySeconds = 1.0;  // between looks for a device that went away
         std::string deviceRoot;     // root of the sysfs and /dev lookups of "auto" ("" = the system's)
+        // The extra records from ModemManager; none: not read.
+        std::optional<modem::ModemManagerLink::Settings> modemManager;
     };
 
     explicit LiveSource(Settings settings);
@@ -131,6 +136,7 @@ class LiveSource : public BasebandSource, private live::DiagSession::Listener, p
     std::uint64_t blobs_ = 0;
     std::uint64_t blobsThisStream_ = 0;
     std::uint64_t badResponses_ = 0;
+    std::unique_ptr<modem::ModemManagerLink> modemManager_;
 };
 
 }  // namespace velmar

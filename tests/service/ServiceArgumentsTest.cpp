@@ -146,13 +146,16 @@ TEST(ServiceOptions, TheSimulatedBasebandIsTheDefaultSource) {
 
 TEST_F(ServiceArgumentsTest, TheHelpNamesTheSimulatorsOptions) {
     const std::vector<std::string> lines = linesOf(runService({"--help"}).out);
-    ASSERT_GE(lines.size(), 5U);
+    ASSERT_GE(lines.size(), 6U);
     EXPECT_EQ(lines[2],
               "                 [--scenario drive|walk|static] [--rate-multiplier X] [--max-channels N]");
     EXPECT_EQ(
         lines[3],
         "                 [--max-connections N] [--queue-memory MIB] [--subscription N] [--record FILE]");
-    EXPECT_EQ(lines[4], "                 | --list-devices");
+    EXPECT_EQ(
+        lines[4],
+        "                 [--modem-manager on|off] [--modem OBJECT-PATH|INDEX] [--bus-address ADDRESS]");
+    EXPECT_EQ(lines[5], "                 | --list-devices");
 }
 
 TEST_F(ServiceArgumentsTest, ASecondInstanceFindsThePortHeldAndExitsOne) {
@@ -243,6 +246,20 @@ TEST(ServiceOptions, TheLiveSourcesOwnOptions) {
     EXPECT_FALSE(
         parseServiceOptions({"--source", "live", "--device", "auto"}).options.subscription.has_value());
 
+    // ModemManager is read by default; --modem and --bus-address are kept as given.
+    EXPECT_TRUE(live.options.modemManager);
+    EXPECT_EQ(live.options.modem, "");
+    EXPECT_EQ(live.options.busAddress, "");
+    const ParsedServiceOptions modem = parseServiceOptions(
+        {"--source", "live", "--device", "auto", "--modem-manager=off", "--modem",
+         "/org/freedesktop/ModemManager1/Modem/3", "--bus-address", "unix:path=/tmp/bus"});
+    ASSERT_EQ(modem.error, "");
+    EXPECT_FALSE(modem.options.modemManager);
+    EXPECT_EQ(modem.options.modem, "/org/freedesktop/ModemManager1/Modem/3");
+    EXPECT_EQ(modem.options.busAddress, "unix:path=/tmp/bus");
+    EXPECT_EQ(parseServiceOptions({"--source", "live", "--device", "auto", "--modem", "2"}).options.modem,
+              "2");
+
     const struct {
         std::vector<std::string> arguments;
         std::string message;
@@ -255,6 +272,13 @@ TEST(ServiceOptions, TheLiveSourcesOwnOptions) {
         {{"--source", "replay", "--input", "x", "--record", "y"},
          "--record does not apply to --source replay"},
         {{"--list-devices=yes"}, "--list-devices takes no value"},
+        {{"--source", "live", "--device", "auto", "--modem-manager", "yes"},
+         "--modem-manager needs on or off, not \"yes\""},
+        {{"--source", "live", "--device", "auto", "--modem", "first"},
+         "--modem needs an object path or an index, not \"first\""},
+        {{"--modem-manager", "off"}, "--modem-manager does not apply to --source sim"},
+        {{"--source", "replay", "--input", "x", "--modem", "0"}, "--modem does not apply to --source replay"},
+        {{"--bus-address", "unix:path=/tmp/bus"}, "--bus-address does not apply to --source sim"},
     };
     for (const auto& testCase : errors) {
         EXPECT_EQ(parseServiceOptions(testCase.arguments).error, testCase.message);

@@ -1,0 +1,208 @@
+// kxserverd --source live with its ModemManager link, run as a user runs it: the modem emulator on a
+// pseudo-terminal as the diagnostic port, and a private dbus-daemon on which a ModemManager-shaped service
+// (fake-modem-manager: one modem with a SIM, two connected bearers, an LTE serving cell and two neighbours)
+// stands in for ModemManager, which cannot run here without modem hardware. A client asks for the three
+// extra records and reads what arrives.
+#include <gtest/gtest.h>
+
+#include <signal.h>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "core/platform/plist/PlistCodec.h"
+#include "service/BasebandBlob.h"
+#include "tests/support/BackgroundProcess.h"
+#include "tests/support/ServiceTestFixture.h"
+#include "tools/modem-emulator/ModemEmulator.h"
+
+namespace velmar::testing {
+namespace {
+
+const std::string kUsing = "<5> modem-manager: using modem /org/freedesktop/ModemManager1/Modem/0\n";
+const std::string kOff = "no SIM files, cell list or data contexts until";
+
+// The property list of each received extra record of code, in order of arrival.
+std::vector<PlistValue> extraRecords(const std::vector<PlistData>& blobs, std::uint16_t code) {
+    std::vector<PlistValue> records;
+    for (const PlistData& blob : blobs) {
+        const BasebandBlob framed = frameBasebandBlob(ByteView(blob.data(), blob.size()));
+        if (framed.kind == BlobKind::Extended && framed.code == code && blob.size() > 13) {
+            if (auto value = parsePropertyList(std::span(blob).subspan(13))) {
+                records.push_back(std::move(*value));
+            }
+        }
+    }
+    return records;
+}
+
+std::string textAt(const PlistValue& dictionary, const std::string& key) {
+    if (!dictionary.isDictionary()) {
+        return "(not a dictionary)";
+    }
+    const PlistValue* value = dictionary.dictionary()->find(key);
+    return value != nullptr && value->isString() ? *value->string() : "(none)";
+}
+
+std::int64_t numberAt(const PlistValue& dictionary, const std::string& key) {
+    const PlistValue* value = dictionary.isDictionary() ? dictionary.dictionary()->find(key) : nullptr;
+    return value != nullptr ? value->integerValue().value_or(-1) : -1;
+}
+
+std::size_t occurrences(const std::string& text, const std::string& part) {
+    std::size_t count = 0;
+    for (std::size_t at = text.find(part); at != std::string::npos; at = text.find(part, at + part.size())) {
+        ++count;
+    }
+    return count;
+}
+
+class ModemManagerLinkTest : public ServiceTest {
+  protected:
+    void SetUp() override {
+        ServiceTest::SetUp();
+        ModemEmulator::Settings settings;
+        settings.capturePath = samplePath("lte-connected-1.qmdl");
+        settings.packetsPerSecond = 50;
+        settings.linkPath = files_.file("modem");
+        modem_ = std::make_unique<ModemEmulator>(settings);
+        std::string error;
+        ASSERT_TRUE(modem_->start(error)) << error;
+        bus_ = std::make_unique<BackgroundProcess>(
+            "/usr/bin/dbus-daemon",
+            std::vector<std::string>{"--session", "--nofork", "--print-address=1",
+                                     "--address=unix:path=" + files_.file("bus")},
+            files_.path());
+        ASSERT_TRUE(bus_->waitForOutput(
+            [](const std::string& out) { return out.find('\n') != std::string::npos; }, kWaitSeconds))
+            << bus_->errorOutput();
+        const std::string out = bus_->standardOutput();
+        address_ = out.substr(0, out.find('\n'));
+    }
+    void TearDown() override {
+        clients_.clear();
+        service_.reset();
+        fake_.reset();
+        bus_.reset();
+        modem_.reset();
+        ServiceTest::TearDown();
+    }
+
+    void startFakeModemManager() {
+        fake_ = std::make_unique<BackgroundProcess>(FAKE_MODEM_MANAGER_PATH,
+                                                    std::vector<std::string>{address_}, files_.path());
+        ASSERT_TRUE(fake_->waitForOutput(
+            [](const std::string& out) { return out.find("ready\n") != std::string::npos; }, kWaitSeconds))
+            << fake_->errorOutput();
+    }
+    ServiceProcess& startLive(const std::string& address) {
+        return startService({"--source", "live", "--device", files_.file("modem"), "--bus-address", address},
+                            {"VELMAR_DIAG_RESPONSE_SECONDS=0.2", "VELMAR_MODEM_MANAGER_RETRY_SECONDS=0.2"});
+    }
+    // A client that asks for the three extra records only.
+    KxTestClient& extrasClient() {
+        KxTestClient& client = newClient();
+        EXPECT_TRUE(client.start({}, {0, 1, 2})) << client.error();
+        return client;
+    }
+    bool waitForRecords(const KxTestClient& client, std::uint16_t code, std::size_t count) {
+        const MainQueue::Handle tick = queue_.repeating(0.01, [] {});
+        const bool held = runUntil([&] { return extraRecords(client.blobs(), code).size() >= count; });
+        queue_.cancelTimer(tick);
+        return held;
+    }
+
+    std::unique_ptr<ModemEmulator> modem_;
+    std::unique_ptr<BackgroundProcess> bus_;
+    std::unique_ptr<BackgroundProcess> fake_;
+    std::string address_;
+};
+
+TEST_F(ModemManagerLinkTest, SimFilesBearersAndCellsComeFromTheModemWhichMayGoAndComeBack) {
+    startFakeModemManager();
+    ServiceProcess& service = startLive(address_);
+    ASSERT_TRUE(service.waitForError(kUsing)) << service.errorOutput();
+    KxTestClient& client = extrasClient();
+    ASSERT_TRUE(waitForRecords(client, 0, 1)) << service.errorOutput();
+    ASSERT_TRUE(waitForRecords(client, 2, 1)) << service.errorOutput();
+    ASSERT_TRUE(waitForRecords(client, 1, 1)) << service.errorOutput();
+
+    const PlistValue sim = extraRecords(client.blobs(), 0).back();
+    EXPECT_EQ(textAt(sim, "kSimFile_ICCID"), "8900101234567890123");
+    EXPECT_EQ(textAt(sim, "kSimFile_IMSI"), "001010123456789");
+    EXPECT_EQ(textAt(sim, "kSimFile_MSISDN"), "+15555550123");
+
+    const PlistValue contexts = extraRecords(client.blobs(), 2).back();
+    ASSERT_TRUE(contexts.isArray());
+    ASSERT_EQ(contexts.array()->size(), 2U);
+    const PlistValue& first = contexts.array()->at(0);
+    const PlistValue& second = contexts.array()->at(1);
+    EXPECT_EQ(numberAt(first, "Context ID"), 0);
+    EXPECT_EQ(textAt(first, "APN"), "internet.test");
+    EXPECT_EQ(textAt(first, "PDP Type"), "IPv4");
+    EXPECT_EQ(textAt(first, "PDP Address"), "10.45.17.201");
+    EXPECT_EQ(textAt(first, "Interface"), "wwan0");
+    EXPECT_EQ(numberAt(second, "Context ID"), 1);
+    EXPECT_EQ(textAt(second, "APN"), "ims.test");
+    EXPECT_EQ(textAt(second, "PDP Type"), "IPv4v6");
+    EXPECT_EQ(textAt(second, "PDP Address"), "10.45.17.202");
+
+    const PlistValue cells = extraRecords(client.blobs(), 1).back();
+    ASSERT_TRUE(cells.isArray());
+    ASSERT_EQ(cells.array()->size(), 3U);
+    const PlistValue& serving = cells.array()->at(0);
+    EXPECT_EQ(textAt(serving, "kKxCellMonitorCellType"), "kKxCellMonitorCellTypeServing");
+    EXPECT_EQ(textAt(serving, "kKxCellMonitorCellRadioAccessTechnology"),
+              "kKxCellMonitorRadioAccessTechnologyLTE");
+    EXPECT_EQ(numberAt(serving, "kKxCellMonitorTAC"), 0x1A2B);
+    EXPECT_EQ(numberAt(serving, "kKxCellMonitorCellId"), 0x1234567);
+    EXPECT_EQ(numberAt(serving, "kKxCellMonitorPID"), 0x1F);
+    EXPECT_EQ(numberAt(serving, "kKxCellMonitorUARFCN"), 1300);
+    EXPECT_EQ(textAt(cells.array()->at(1), "kKxCellMonitorCellType"), "kKxCellMonitorCellTypeNeighbor");
+    EXPECT_EQ(numberAt(cells.array()->at(2), "kKxCellMonitorPID"), 0x2A);
+    EXPECT_EQ(numberAt(cells.array()->at(2), "kKxCellMonitorUARFCN"), 6300);
+
+    // The modem goes: one notice, the service goes on; it comes back: picked up, its records sent again.
+    fake_->sendSignal(SIGUSR1);
+    ASSERT_TRUE(service.waitForError("<5> modem-manager: no modem; " + kOff + " one appears\n"))
+        << service.errorOutput();
+    const std::size_t simRecords = extraRecords(client.blobs(), 0).size();
+    fake_->sendSignal(SIGUSR2);
+    ASSERT_TRUE(runUntil([&] { return occurrences(service.errorOutput(), kUsing) == 2; }, kWaitSeconds))
+        << service.errorOutput();
+    EXPECT_TRUE(waitForRecords(client, 0, simRecords + 1)) << service.errorOutput();
+    EXPECT_FALSE(service.waitForExit(0).has_value());
+}
+
+TEST_F(ModemManagerLinkTest, ModemManagerAbsentAtStartIsPickedUpWhenItAppears) {
+    ServiceProcess& service = startLive(address_);
+    ASSERT_TRUE(
+        service.waitForError("<5> modem-manager: ModemManager is not on the bus "
+                             "(org.freedesktop.DBus.Error.ServiceUnknown); " +
+                             kOff + " it appears\n"))
+        << service.errorOutput();
+    KxTestClient& client = extrasClient();
+    startFakeModemManager();
+    ASSERT_TRUE(service.waitForError(kUsing)) << service.errorOutput();
+    ASSERT_TRUE(waitForRecords(client, 0, 1)) << service.errorOutput();
+    EXPECT_EQ(textAt(extraRecords(client.blobs(), 0).back(), "kSimFile_ICCID"), "8900101234567890123");
+}
+
+TEST_F(ModemManagerLinkTest, NoBusIsOneNoticeAndTheDiagnosticPortStillServes) {
+    const std::string missing = "unix:path=" + files_.file("no-bus");
+    ServiceProcess& service = startLive(missing);
+    ASSERT_TRUE(service.waitForError("<5> modem-manager: no bus (" + missing +
+                                     ": No such file or directory); " + kOff + " it is there\n"))
+        << service.errorOutput();
+    KxTestClient& client = newClient();
+    ASSERT_TRUE(client.start({0xB0C2, 0xB0C1}, {0, 1, 2})) << client.error();
+    const MainQueue::Handle tick = queue_.repeating(0.01, [] {});
+    EXPECT_TRUE(runUntil([&] { return !client.blobs().empty(); })) << service.errorOutput();
+    queue_.cancelTimer(tick);
+    EXPECT_TRUE(extraRecords(client.blobs(), 0).empty());
+    EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: no bus"), 1U);
+}
+
+}  // namespace
+}  // namespace velmar::testing
