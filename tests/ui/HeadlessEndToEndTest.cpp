@@ -19,6 +19,7 @@
 #include <chrono>
 #include <cstdint>
 #include <memory>
+#include <numeric>
 #include <set>
 #include <string>
 #include <thread>
@@ -520,6 +521,110 @@ TEST_F(HeadlessEndToEndTest, AReplayedCaptureShowsItsTrueValues) {
               "42");
     EXPECT_TRUE(neighbours.contains("472")) << neighbours.size();
     EXPECT_TRUE(neighbours.contains("54")) << neighbours.size();
+}
+
+// A live modem whose SIM, bearers and cells come from a ModemManager-shaped service on a private bus (the
+// real ModemManager needs modem hardware): "SIM Info", "PDP Context Info" and the serving-cell keys that
+// the cell monitor feeds fill in; the modem goes away (the values stay, the service lives) and comes back.
+TEST_F(HeadlessEndToEndTest, ModemManagerFillsTheSimContextsAndCellMonitorKeys) {
+    testing::TemporaryDirectory files;
+    testing::BackgroundProcess bus(
+        "/usr/bin/dbus-daemon",
+        {"--session", "--nofork", "--print-address=1", "--address=unix:path=" + files.path() + "/bus"},
+        files.path());
+    ASSERT_TRUE(
+        bus.waitForOutput([](const std::string& out) { return out.find('\n') != std::string::npos; }, 30))
+        << bus.errorOutput();
+    const std::string address = bus.standardOutput().substr(0, bus.standardOutput().find('\n'));
+    testing::BackgroundProcess fake(FAKE_MODEM_MANAGER_PATH, {address}, files.path());
+    ASSERT_TRUE(fake.waitForOutput(
+        [](const std::string& out) { return out.find("ready\n") != std::string::npos; }, 30))
+        << fake.errorOutput();
+    testing::ModemEmulator::Settings settings;
+    settings.capturePath = std::string(VELMAR_SOURCE_DIR) + "/samples/captures/lte-connected-1.qmdl";
+    settings.linkPath = files.path() + "/modem";
+    settings.packetsPerSecond = 20;
+    testing::ModemEmulator modem(settings);
+    std::string error;
+    ASSERT_TRUE(modem.start(error)) << error;
+    std::vector<std::string> serviceEnvironment = environment();
+    serviceEnvironment.push_back("VELMAR_LOG_LEVEL=notice");
+    // This process looks for the service's port: in the same runtime directory.
+    setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
+    struct Unset {
+        ~Unset() { unsetenv("VELMAR_RUNTIME_DIR"); }
+    } unset;
+    testing::ServiceProcess service(
+        {"--source", "live", "--device", settings.linkPath, "--bus-address", address, "--log-stderr"},
+        outputs_.path(), serviceEnvironment);
+    ASSERT_TRUE(service.waitUntilServing(30)) << service.errorOutput();
+    auto monitor = startMonitor(files.path());
+
+    // Each fact shows in some connected redraw (the capture's own serving-cell records overwrite some of
+    // the cell monitor's keys between two of its arrays).
+    std::set<std::string> seen;
+    const auto showsAll = [&seen](const std::string& out) {
+        seen.clear();
+        for (const HeadlessLine& line : headlessLines(out)) {
+            if (!line.connected) {
+                continue;
+            }
+            for (const auto& [path, value] : testing::leavesOfJson(line.tree)) {
+                if (path.ends_with("SIM Info/EF-ICCID") && value == "8900101234567890123") {
+                    seen.insert("iccid");
+                } else if (path.ends_with("SIM Info/EF-MSISDN") && value == "+15555550123") {
+                    seen.insert("msisdn");
+                } else if (path.find("PDP Context Info") != std::string::npos && value == "internet.test") {
+                    seen.insert("first bearer");
+                } else if (path.find("PDP Context Info") != std::string::npos && value == "ims.test") {
+                    seen.insert("second bearer");
+                } else if (path.ends_with("Serving Cell Info/UARFCN") && value == "1300") {
+                    seen.insert("uarfcn");
+                } else if (path.ends_with("Serving Cell Info/Tracking Area Code") && value == "6699") {
+                    seen.insert("tac");
+                }
+            }
+        }
+        return seen.size() == 6;
+    };
+    ASSERT_TRUE(monitor->waitForOutput(showsAll, 30))
+        << "seen: "
+        << std::accumulate(seen.begin(), seen.end(), std::string(),
+                           [](std::string all, const std::string& one) { return all + one + "; "; })
+        << "\n"
+        << service.errorOutput() << monitor->errorOutput();
+
+    // The modem goes: the service says so once and lives on, the monitor keeps the last values.
+    fake.sendSignal(SIGUSR1);
+    ASSERT_TRUE(service.waitForError("<5> modem-manager: no modem; ", 10)) << service.errorOutput();
+    const std::size_t linesBefore = testing::linesOf(monitor->standardOutput()).size();
+    EXPECT_TRUE(monitor->waitForOutput(
+        [&](const std::string& out) {
+            const std::vector<HeadlessLine> lines = headlessLines(out);
+            if (lines.size() < linesBefore + 2 || !lines.back().connected) {
+                return false;
+            }
+            for (const auto& [path, value] : testing::leavesOfJson(lines.back().tree)) {
+                if (path.ends_with("SIM Info/EF-ICCID")) {
+                    return value == "8900101234567890123";
+                }
+            }
+            return false;
+        },
+        15))
+        << monitor->standardOutput().substr(0, 2000);
+    fake.sendSignal(SIGUSR2);
+    EXPECT_TRUE(testing::waitUntil(
+        [&] {
+            const std::string err = service.errorOutput();
+            const std::string line =
+                "<5> modem-manager: using modem /org/freedesktop/ModemManager1/Modem/0\n";
+            const std::size_t first = err.find(line);
+            return first != std::string::npos && err.find(line, first + line.size()) != std::string::npos;
+        },
+        10))
+        << service.errorOutput();
+    EXPECT_FALSE(service.waitForExit(0).has_value());
 }
 
 // Every technology of the simulated baseband reaches the screen as a connected tree whose values change.
