@@ -126,7 +126,9 @@ void ModemManagerLink::demandChanged() {
 }
 
 void ModemManagerLink::enter(State state, const std::string& detail) {
-    if (state == state_ && detail == stateDetail_) {
+    // One notice per state: an absence that goes on for another reason (the bus lost, then not found) is
+    // not news; another modem in use is.
+    if (state == state_ && (detail == stateDetail_ || state != State::Using)) {
         return;
     }
     state_ = state;

@@ -204,5 +204,24 @@ TEST_F(ModemManagerLinkTest, NoBusIsOneNoticeAndTheDiagnosticPortStillServes) {
     EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: no bus"), 1U);
 }
 
+TEST_F(ModemManagerLinkTest, TheBusGoingAwayIsOneNoticeAndTheServiceGoesOn) {
+    startFakeModemManager();
+    ServiceProcess& service = startLive(address_);
+    ASSERT_TRUE(service.waitForError(kUsing)) << service.errorOutput();
+    fake_.reset();
+    bus_.reset();
+    ASSERT_TRUE(service.waitForError("<5> modem-manager: no bus (the connection was lost: "))
+        << service.errorOutput();
+    // Still serving the diagnostic port's packets, while the bus is looked for again every 0.2 s.
+    KxTestClient& client = newClient();
+    ASSERT_TRUE(client.start({0xB0C2, 0xB0C1}, {0, 1, 2})) << client.error();
+    const MainQueue::Handle tick = queue_.repeating(0.01, [] {});
+    EXPECT_TRUE(runUntil([&] { return client.blobs().size() >= 3; })) << service.errorOutput();
+    queue_.runFor(0.5);  // two more looks for the bus, which fail for another reason without a second notice
+    queue_.cancelTimer(tick);
+    EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: no bus"), 1U) << service.errorOutput();
+    EXPECT_FALSE(service.waitForExit(0).has_value());
+}
+
 }  // namespace
 }  // namespace velmar::testing
