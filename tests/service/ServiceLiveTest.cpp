@@ -43,7 +43,7 @@ TEST_F(LiveTest, ReadsACaptureThroughAFifoAndTheNextWriterToo) {
     const std::vector<PlistData> expected = adaptedBlobs(captureBlobs(capture, 1));
     ASSERT_EQ(expected.size(), 734U);
 
-    ServiceProcess& service = startService({"--source", "live", "--device", fifo});
+    ServiceProcess& service = startService({"--source", "live", "--device", fifo, "--modem-manager", "off"});
     KxTestClient& client = newClient();
     std::vector<std::int64_t> codes = codesOf(blobsOfFile(capture));
     codes.push_back(0x4116);

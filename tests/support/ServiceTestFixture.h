@@ -1,5 +1,6 @@
 // ServiceTest: the fixture of the tests that run kxserverd: a private runtime directory (so that tests never
-// share ports), a poll main queue for the test's clients, and bounded waits.
+// share ports), a system bus that never exists (so that no test reaches the machine's), a poll main queue
+// for the test's clients, and bounded waits.
 #pragma once
 
 #include <gtest/gtest.h>
@@ -24,6 +25,8 @@ class ServiceTest : public ::testing::Test {
     void SetUp() override {
         ASSERT_FALSE(runtime_.path().empty());
         setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
+        // What the test itself runs (runProcess, BackgroundProcess) inherits a system bus that never exists.
+        setenv("DBUS_SYSTEM_BUS_ADDRESS", unreachableSystemBus(files_.path()).c_str(), 1);
         MainQueue::setCurrent(&queue_);
     }
     void TearDown() override {
@@ -31,6 +34,7 @@ class ServiceTest : public ::testing::Test {
         service_.reset();
         MainQueue::setCurrent(nullptr);
         unsetenv("VELMAR_RUNTIME_DIR");
+        unsetenv("DBUS_SYSTEM_BUS_ADDRESS");
     }
 
     // Starts kxserverd with arguments (log lines at notice and above mirrored to its standard error), and

@@ -415,8 +415,9 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
     struct Unset {
         ~Unset() { unsetenv("VELMAR_RUNTIME_DIR"); }
     } unset;
-    testing::ServiceProcess service({"--source", "live", "--device", "auto", "--log-stderr"}, outputs_.path(),
-                                    serviceEnvironment);
+    testing::ServiceProcess service(
+        {"--source", "live", "--device", "auto", "--modem-manager", "off", "--log-stderr"}, outputs_.path(),
+        serviceEnvironment);
     ASSERT_TRUE(service.waitUntilServing(30)) << service.errorOutput();
     testing::TemporaryDirectory monitorOutputs;
     auto monitor = startMonitor(monitorOutputs.path());

@@ -7,6 +7,8 @@
 #include <algorithm>
 #include <utility>
 
+#include "tests/support/ServiceProcess.h"
+
 namespace velmar::testing {
 
 namespace {
@@ -26,7 +28,7 @@ std::unique_ptr<BackgroundProcess> startService(const std::vector<std::string>& 
     unlink((runtimeDirectory + "/" + kControlPort).c_str());
     auto process = std::make_unique<BackgroundProcess>(
         KXSERVERD_PATH, arguments, runtimeDirectory,
-        std::vector<std::string>{"VELMAR_RUNTIME_DIR=" + runtimeDirectory});
+        withoutTheSystemBus({"VELMAR_RUNTIME_DIR=" + runtimeDirectory}, runtimeDirectory));
     const bool up = waitUntil(
         [&] { return exists(runtimeDirectory + "/" + kControlPort) || process->waitForExit(0).has_value(); },
         seconds);

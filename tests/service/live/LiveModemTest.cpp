@@ -92,7 +92,9 @@ class LiveModemTest : public ServiceTest {
 
     ServiceProcess& startLive(std::vector<std::string> arguments = {},
                               std::vector<std::string> environment = kQuickTiming) {
-        std::vector<std::string> all = {"--source", "live", "--device", modemPath()};
+        // ModemManager is not the subject here: its link stays off, and the logs hold only the port's lines.
+        std::vector<std::string> all = {"--source",        "live", "--device", modemPath(),
+                                        "--modem-manager", "off"};
         all.insert(all.end(), arguments.begin(), arguments.end());
         return startService(all, environment);
     }
@@ -201,7 +203,8 @@ TEST_F(LiveModemTest, ProbesSetsUpMasksThatFollowTheChannelsAndEndsWithLoggingOf
 TEST_F(LiveModemTest, ASilentDeviceIsRefusedWithItsPathNamed) {
     ModemEmulator& modem = startModem("");
     modem.setSilent(true);
-    ServiceProcess service({"--source", "live", "--device", modemPath()}, files_.path(), kQuickTiming);
+    ServiceProcess service({"--source", "live", "--device", modemPath(), "--modem-manager", "off"},
+                           files_.path(), kQuickTiming);
     const std::optional<int> status = service.waitForExit(kWaitSeconds);
     ASSERT_TRUE(status.has_value());
     EXPECT_EQ(*status, 1);
@@ -466,7 +469,8 @@ TEST_F(LiveModemTest, AutoTakesTheFirstCandidateThatAnswers) {
     });
     std::vector<std::string> environment = kQuickTiming;
     environment.push_back("VELMAR_SYSROOT=" + root.path());
-    ServiceProcess& service = startService({"--source", "live", "--device", "auto"}, environment);
+    ServiceProcess& service =
+        startService({"--source", "live", "--device", "auto", "--modem-manager", "off"}, environment);
     KxTestClient& client = newClient();
     ASSERT_TRUE(client.start(kLteCodes, {}));
     ASSERT_TRUE(waitForCodes(kLteCodeSet)) << service.errorOutput();
