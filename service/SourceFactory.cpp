@@ -51,6 +51,8 @@ LiveSource::Settings liveSettings(const ServiceOptions& options) {
         link.busAddress = options.busAddress;
         link.modem = options.modem;
         link.retrySeconds = secondsFromEnvironment("VELMAR_MODEM_MANAGER_RETRY_SECONDS", link.retrySeconds);
+        link.cellInfoSeconds =
+            secondsFromEnvironment("VELMAR_MODEM_MANAGER_CELL_SECONDS", link.cellInfoSeconds);
         settings.modemManager = link;
     }
     return settings;

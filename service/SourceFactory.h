@@ -17,8 +17,9 @@ namespace velmar {
 std::unique_ptr<BasebandSource> makeBasebandSource(const ServiceOptions& options, std::string& error);
 
 // The live source's settings: the command line's, with the timing that VELMAR_DIAG_RESPONSE_SECONDS,
-// VELMAR_DIAG_KEEPALIVE_SECONDS and VELMAR_DIAG_RETRY_SECONDS may shorten (tests), and the device root of
-// $VELMAR_SYSROOT.
+// VELMAR_DIAG_KEEPALIVE_SECONDS, VELMAR_DIAG_RETRY_SECONDS, VELMAR_MODEM_MANAGER_RETRY_SECONDS (between
+// looks for the bus) and VELMAR_MODEM_MANAGER_CELL_SECONDS (between cell lists) may shorten (tests), and
+// the device root of $VELMAR_SYSROOT.
 LiveSource::Settings liveSettings(const ServiceOptions& options);
 
 }  // namespace velmar

@@ -164,13 +164,16 @@ void ModemManagerLink::report(std::vector<std::string>& problems) {
                            static_cast<long long>(kProblemWindow.count()));
         }
         problemWindowStart_ = now;
-        problemsLogged_ = 0;
+        problemsLogged_.clear();
         problemsSuppressed_ = 0;
     }
-    for (const std::string& problem : problems) {
-        if (problemsLogged_ < kProblemsPerWindow) {
-            ++problemsLogged_;
+    for (std::string& problem : problems) {
+        // The same bad value comes back with every poll: it is told once a window, then only counted.
+        const bool told =
+            std::find(problemsLogged_.begin(), problemsLogged_.end(), problem) != problemsLogged_.end();
+        if (!told && problemsLogged_.size() < kProblemsPerWindow) {
             SystemLog::log(kLogWarning, "modem-manager: %s", problem.c_str());
+            problemsLogged_.push_back(std::move(problem));
         } else {
             ++problemsSuppressed_;
         }

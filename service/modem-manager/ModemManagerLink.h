@@ -15,8 +15,9 @@
 // - Absence is normal: no bus, ModemManager not on it, no modem, an ambiguous choice, a modem removed: one
 //   notice for each new state, the extras stop, nothing else is affected. The bus is tried again every
 //   retrySeconds; ModemManager and modems appearing later are picked up from the bus's signals.
-// - Values of the wrong type or out of range are skipped (ModemRecords) and logged as warnings, at most
-//   kProblemsPerWindow lines every kProblemWindow; the rest are counted and summed up.
+// - Values of the wrong type or out of range are skipped (ModemRecords) and logged as warnings: each line at
+//   most once every kProblemWindow, however often the value comes back, and at most kProblemsPerWindow
+//   lines a window; repeats and the rest are counted and summed up in one line when the next window opens.
 #pragma once
 
 #include <chrono>
@@ -54,7 +55,7 @@ class ModemManagerLink {
     // The channels' demand may have changed: records newly asked for go out now.
     void demandChanged();
 
-    static constexpr int kProblemsPerWindow = 5;
+    static constexpr std::size_t kProblemsPerWindow = 5;
     static constexpr std::chrono::seconds kProblemWindow{60};
 
   private:
@@ -104,7 +105,7 @@ class ModemManagerLink {
     bool wantedCells_ = false;
 
     std::chrono::steady_clock::time_point problemWindowStart_{};
-    int problemsLogged_ = 0;
+    std::vector<std::string> problemsLogged_;  // this window's lines, at most kProblemsPerWindow
     std::uint64_t problemsSuppressed_ = 0;
 };
 

@@ -1,33 +1,45 @@
 // fake-modem-manager: a ModemManager-shaped service for the tests of the service's ModemManager link, run on
-// a private dbus-daemon. It owns org.freedesktop.ModemManager1 on the bus given as its only argument and
-// exports, under an object manager at /org/freedesktop/ModemManager1, one modem (Modem/0) with a SIM
-// (SIM/0), two connected bearers (Bearer/0 and Bearer/1) and GetCellInfo answering an LTE serving cell and
-// two neighbours.
+// a private dbus-daemon. It owns org.freedesktop.ModemManager1 on the bus given as its first argument and
+// exports, under an object manager at /org/freedesktop/ModemManager1, one modem (Modem/0, ports ttyUSB0 and
+// wwan0) with a SIM (SIM/0), two connected bearers (Bearer/0 and Bearer/1) and GetCellInfo answering an LTE
+// serving cell and two neighbours.
 //
-// SIGUSR1 removes the modem (InterfacesRemoved), SIGUSR2 brings it back (InterfacesAdded), SIGTERM ends the
+// Options after the address:
+//   --two-modems   a second modem (Modem/1, port ttyUSB2) with its own SIM (SIM/1) and one connected bearer
+//                  (Bearer/2)
+//   --port NAME    the second modem also lists the port NAME (so that it owns the diagnostic port)
+//   --wrong-types  GetCellInfo gives the neighbours' "earfcn" as a string instead of an unsigned integer
+//
+// SIGUSR1 removes Modem/0 (InterfacesRemoved), SIGUSR2 brings it back (InterfacesAdded), SIGTERM ends the
 // program. It prints "ready" once it owns its name and "removed" / "added" after each change.
 #include <signal.h>
 #include <systemd/sd-bus.h>
 #include <systemd/sd-event.h>
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdio>
 #include <cstring>
 #include <initializer_list>
+#include <string>
+#include <vector>
 
 namespace {
 
 constexpr const char* kRoot = "/org/freedesktop/ModemManager1";
-constexpr const char* kModem = "/org/freedesktop/ModemManager1/Modem/0";
 constexpr const char* kModemInterface = "org.freedesktop.ModemManager1.Modem";
+constexpr const char* kSimInterface = "org.freedesktop.ModemManager1.Sim";
+constexpr const char* kBearerInterface = "org.freedesktop.ModemManager1.Bearer";
 
 struct Sim {
-    const char* identifier = "8900101234567890123";
-    const char* imsi = "001010123456789";
+    const char* path;
+    const char* identifier;
+    const char* imsi;
 };
 
 struct Bearer {
-    int connected = 1;
+    const char* path;
+    int connected;
     const char* interfaceName;
     const char* apn;
     unsigned ipType;
@@ -35,28 +47,65 @@ struct Bearer {
     const char* dns;
 };
 
-Sim theSim;
-Bearer theBearers[2] = {{1, "wwan0", "internet.test", 1, "10.45.17.201", "10.45.0.1"},
-                        {1, "wwan1", "ims.test", 4, "10.45.17.202", "10.45.0.2"}};
-sd_bus_slot* modemSlot = nullptr;
+struct Modem {
+    const char* path;
+    const char* simPath;
+    std::vector<const char*> bearerPaths;
+    const char* ownNumber;
+    std::vector<std::string> ports;  // each of type 3 (a serial port)
+    sd_bus_slot* slot = nullptr;
+};
 
-int modemSim(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void*, sd_bus_error*) {
-    return sd_bus_message_append(reply, "o", "/org/freedesktop/ModemManager1/SIM/0");
+Sim theSims[2] = {{"/org/freedesktop/ModemManager1/SIM/0", "8900101234567890123", "001010123456789"},
+                  {"/org/freedesktop/ModemManager1/SIM/1", "8900109876543210987", "001010987654321"}};
+Bearer theBearers[3] = {
+    {"/org/freedesktop/ModemManager1/Bearer/0", 1, "wwan0", "internet.test", 1, "10.45.17.201", "10.45.0.1"},
+    {"/org/freedesktop/ModemManager1/Bearer/1", 1, "wwan1", "ims.test", 4, "10.45.17.202", "10.45.0.2"},
+    {"/org/freedesktop/ModemManager1/Bearer/2", 1, "wwan2", "second.test", 1, "10.45.18.1", "10.45.0.3"}};
+Modem theModems[2] = {{"/org/freedesktop/ModemManager1/Modem/0",
+                       theSims[0].path,
+                       {theBearers[0].path, theBearers[1].path},
+                       "+15555550123",
+                       {"ttyUSB0", "wwan0"}},
+                      {"/org/freedesktop/ModemManager1/Modem/1",
+                       theSims[1].path,
+                       {theBearers[2].path},
+                       "+15555550199",
+                       {"ttyUSB2"}}};
+bool wrongTypes = false;
+
+int modemSim(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void* userdata,
+             sd_bus_error*) {
+    return sd_bus_message_append(reply, "o", static_cast<const Modem*>(userdata)->simPath);
 }
 
-int modemBearers(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void*,
+int modemBearers(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void* userdata,
                  sd_bus_error*) {
-    return sd_bus_message_append(reply, "ao", 2, "/org/freedesktop/ModemManager1/Bearer/0",
-                                 "/org/freedesktop/ModemManager1/Bearer/1");
+    const auto* modem = static_cast<const Modem*>(userdata);
+    int result = sd_bus_message_open_container(reply, 'a', "o");
+    for (const char* path : modem->bearerPaths) {
+        if (result >= 0) {
+            result = sd_bus_message_append(reply, "o", path);
+        }
+    }
+    return result < 0 ? result : sd_bus_message_close_container(reply);
 }
 
-int modemNumbers(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void*,
+int modemNumbers(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void* userdata,
                  sd_bus_error*) {
-    return sd_bus_message_append(reply, "as", 1, "+15555550123");
+    return sd_bus_message_append(reply, "as", 1, static_cast<const Modem*>(userdata)->ownNumber);
 }
 
-int modemPorts(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void*, sd_bus_error*) {
-    return sd_bus_message_append(reply, "a(su)", 2, "ttyUSB0", 3U, "wwan0", 2U);
+int modemPorts(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void* userdata,
+               sd_bus_error*) {
+    const auto* modem = static_cast<const Modem*>(userdata);
+    int result = sd_bus_message_open_container(reply, 'a', "(su)");
+    for (const std::string& port : modem->ports) {
+        if (result >= 0) {
+            result = sd_bus_message_append(reply, "(su)", port.c_str(), 3U);
+        }
+    }
+    return result < 0 ? result : sd_bus_message_close_container(reply);
 }
 
 int bearerProperties(sd_bus*, const char*, const char*, const char*, sd_bus_message* reply, void* userdata,
@@ -77,6 +126,12 @@ int appendLteCell(sd_bus_message* reply, int serving, const char* pci, unsigned 
         return sd_bus_message_append(reply, "a{sv}", 7, "cell-type", "u", 5U, "serving", "b", 1,
                                      "operator-id", "s", "00101", "tac", "s", "1A2B", "ci", "s", "1234567",
                                      "physical-ci", "s", pci, "earfcn", "u", earfcn);
+    }
+    if (wrongTypes) {
+        const std::string text = std::to_string(earfcn);
+        return sd_bus_message_append(reply, "a{sv}", 5, "cell-type", "u", 5U, "serving", "b", 0,
+                                     "physical-ci", "s", pci, "earfcn", "s", text.c_str(), "rsrp", "d",
+                                     -101.5);
     }
     return sd_bus_message_append(reply, "a{sv}", 5, "cell-type", "u", 5U, "serving", "b", 0, "physical-ci",
                                  "s", pci, "earfcn", "u", earfcn, "rsrp", "d", -101.5);
@@ -133,20 +188,21 @@ const sd_bus_vtable kBearerVtable[] = {
     SD_BUS_VTABLE_END,
 };
 
-int addModem(sd_bus* bus) {
+int addModem(sd_bus* bus, Modem& modem) {
     const int result =
-        sd_bus_add_object_vtable(bus, &modemSlot, kModem, kModemInterface, kModemVtable, nullptr);
-    return result < 0 ? result : sd_bus_emit_interfaces_added(bus, kModem, kModemInterface, nullptr);
+        sd_bus_add_object_vtable(bus, &modem.slot, modem.path, kModemInterface, kModemVtable, &modem);
+    return result < 0 ? result : sd_bus_emit_interfaces_added(bus, modem.path, kModemInterface, nullptr);
 }
 
 int onSignal(sd_event_source* source, const struct signalfd_siginfo* info, void* userdata) {
     auto* bus = static_cast<sd_bus*>(userdata);
-    if (info->ssi_signo == SIGUSR1 && modemSlot != nullptr) {
-        sd_bus_emit_interfaces_removed(bus, kModem, kModemInterface, nullptr);
-        modemSlot = sd_bus_slot_unref(modemSlot);
+    Modem& modem = theModems[0];
+    if (info->ssi_signo == SIGUSR1 && modem.slot != nullptr) {
+        sd_bus_emit_interfaces_removed(bus, modem.path, kModemInterface, nullptr);
+        modem.slot = sd_bus_slot_unref(modem.slot);
         std::puts("removed");
-    } else if (info->ssi_signo == SIGUSR2 && modemSlot == nullptr) {
-        addModem(bus);
+    } else if (info->ssi_signo == SIGUSR2 && modem.slot == nullptr) {
+        addModem(bus, modem);
         std::puts("added");
     } else if (info->ssi_signo == SIGTERM) {
         sd_event_exit(sd_event_source_get_event(source), 0);
@@ -160,12 +216,30 @@ int fail(const char* what, int result) {
     return 1;
 }
 
+int usage() {
+    std::fprintf(stderr,
+                 "usage: fake-modem-manager BUS-ADDRESS [--two-modems] [--port NAME] [--wrong-types]\n");
+    return 2;
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
-    if (argc != 2) {
-        std::fprintf(stderr, "usage: fake-modem-manager BUS-ADDRESS\n");
-        return 2;
+    if (argc < 2) {
+        return usage();
+    }
+    int modems = 1;
+    for (int index = 2; index < argc; ++index) {
+        const std::string option = argv[index];
+        if (option == "--two-modems") {
+            modems = 2;
+        } else if (option == "--port" && index + 1 < argc) {
+            theModems[1].ports.emplace_back(argv[++index]);
+        } else if (option == "--wrong-types") {
+            wrongTypes = true;
+        } else {
+            return usage();
+        }
     }
     sigset_t signals;
     sigemptyset(&signals);
@@ -193,14 +267,19 @@ int main(int argc, char** argv) {
         return fail("event loop", result);
     }
     sd_bus_add_object_manager(bus, nullptr, kRoot);
-    sd_bus_add_object_vtable(bus, nullptr, "/org/freedesktop/ModemManager1/SIM/0",
-                             "org.freedesktop.ModemManager1.Sim", kSimVtable, &theSim);
-    sd_bus_add_object_vtable(bus, nullptr, "/org/freedesktop/ModemManager1/Bearer/0",
-                             "org.freedesktop.ModemManager1.Bearer", kBearerVtable, &theBearers[0]);
-    sd_bus_add_object_vtable(bus, nullptr, "/org/freedesktop/ModemManager1/Bearer/1",
-                             "org.freedesktop.ModemManager1.Bearer", kBearerVtable, &theBearers[1]);
-    if ((result = addModem(bus)) < 0) {
-        return fail("modem object", result);
+    for (int index = 0; index < modems; ++index) {
+        Modem& modem = theModems[index];
+        Sim& sim = theSims[index];
+        sd_bus_add_object_vtable(bus, nullptr, sim.path, kSimInterface, kSimVtable, &sim);
+        for (Bearer& bearer : theBearers) {
+            if (std::find(modem.bearerPaths.begin(), modem.bearerPaths.end(), bearer.path) !=
+                modem.bearerPaths.end()) {
+                sd_bus_add_object_vtable(bus, nullptr, bearer.path, kBearerInterface, kBearerVtable, &bearer);
+            }
+        }
+        if ((result = addModem(bus, modem)) < 0) {
+            return fail("modem object", result);
+        }
     }
     for (const int signal : {SIGUSR1, SIGUSR2, SIGTERM}) {
         sd_event_add_signal(event, nullptr, signal, onSignal, bus);
@@ -211,6 +290,9 @@ int main(int argc, char** argv) {
     std::puts("ready");
     std::fflush(stdout);
     result = sd_event_loop(event);
+    for (Modem& modem : theModems) {
+        modem.slot = sd_bus_slot_unref(modem.slot);
+    }
     sd_bus_flush_close_unref(bus);
     sd_event_unref(event);
     return result < 0 ? 1 : 0;

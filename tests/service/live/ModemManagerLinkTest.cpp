@@ -7,6 +7,7 @@
 
 #include <signal.h>
 
+#include <cstdlib>
 #include <memory>
 #include <string>
 #include <vector>
@@ -21,7 +22,17 @@ namespace velmar::testing {
 namespace {
 
 const std::string kUsing = "<5> modem-manager: using modem /org/freedesktop/ModemManager1/Modem/0\n";
+const std::string kUsingSecond = "<5> modem-manager: using modem /org/freedesktop/ModemManager1/Modem/1\n";
 const std::string kOff = "no SIM files, cell list or data contexts until";
+
+// What fake-modem-manager's SIMs hold: SIM/0 of Modem/0 and SIM/1 of Modem/1.
+struct SimIdentities {
+    std::string iccid;
+    std::string imsi;
+    std::string msisdn;
+};
+const SimIdentities kFirstSim = {"8900101234567890123", "001010123456789", "+15555550123"};
+const SimIdentities kSecondSim = {"8900109876543210987", "001010987654321", "+15555550199"};
 
 // The property list of each received extra record of code, in order of arrival.
 std::vector<PlistValue> extraRecords(const std::vector<PlistData>& blobs, std::uint16_t code) {
@@ -48,14 +59,6 @@ std::string textAt(const PlistValue& dictionary, const std::string& key) {
 std::int64_t numberAt(const PlistValue& dictionary, const std::string& key) {
     const PlistValue* value = dictionary.isDictionary() ? dictionary.dictionary()->find(key) : nullptr;
     return value != nullptr ? value->integerValue().value_or(-1) : -1;
-}
-
-std::size_t occurrences(const std::string& text, const std::string& part) {
-    std::size_t count = 0;
-    for (std::size_t at = text.find(part); at != std::string::npos; at = text.find(part, at + part.size())) {
-        ++count;
-    }
-    return count;
 }
 
 class ModemManagerLinkTest : public ServiceTest {
@@ -89,16 +92,44 @@ class ModemManagerLinkTest : public ServiceTest {
         ServiceTest::TearDown();
     }
 
-    void startFakeModemManager() {
-        fake_ = std::make_unique<BackgroundProcess>(FAKE_MODEM_MANAGER_PATH,
-                                                    std::vector<std::string>{address_}, files_.path());
+    // options: those of fake-modem-manager after the bus address.
+    void startFakeModemManager(const std::vector<std::string>& options = {}) {
+        std::vector<std::string> arguments = {address_};
+        arguments.insert(arguments.end(), options.begin(), options.end());
+        fake_ = std::make_unique<BackgroundProcess>(FAKE_MODEM_MANAGER_PATH, arguments, files_.path());
         ASSERT_TRUE(fake_->waitForOutput(
             [](const std::string& out) { return out.find("ready\n") != std::string::npos; }, kWaitSeconds))
             << fake_->errorOutput();
     }
-    ServiceProcess& startLive(const std::string& address) {
-        return startService({"--source", "live", "--device", files_.file("modem"), "--bus-address", address},
-                            {"VELMAR_DIAG_RESPONSE_SECONDS=0.2", "VELMAR_MODEM_MANAGER_RETRY_SECONDS=0.2"});
+    ServiceProcess& startLive(const std::string& address, const std::vector<std::string>& options = {},
+                              const std::vector<std::string>& environment = {}) {
+        std::vector<std::string> arguments = {"--source",           "live",          "--device",
+                                              files_.file("modem"), "--bus-address", address};
+        arguments.insert(arguments.end(), options.begin(), options.end());
+        std::vector<std::string> assignments = {"VELMAR_DIAG_RESPONSE_SECONDS=0.2",
+                                                "VELMAR_MODEM_MANAGER_RETRY_SECONDS=0.2"};
+        assignments.insert(assignments.end(), environment.begin(), environment.end());
+        return startService(arguments, assignments);
+    }
+    // Waits for a SIM record and checks that the last one holds the identities of the modem's SIM.
+    void expectSim(const KxTestClient& client, const ServiceProcess& service, const SimIdentities& expected) {
+        ASSERT_TRUE(waitForRecords(client, 0, 1)) << service.errorOutput();
+        const PlistValue sim = extraRecords(client.blobs(), 0).back();
+        EXPECT_EQ(textAt(sim, "kSimFile_ICCID"), expected.iccid);
+        EXPECT_EQ(textAt(sim, "kSimFile_IMSI"), expected.imsi);
+        EXPECT_EQ(textAt(sim, "kSimFile_MSISDN"), expected.msisdn);
+    }
+    // The SIM and bearer records of the second modem, once they have arrived.
+    void expectSecondModemsRecords(const KxTestClient& client, const ServiceProcess& service) {
+        expectSim(client, service, kSecondSim);
+        ASSERT_TRUE(waitForRecords(client, 2, 1)) << service.errorOutput();
+        const PlistValue contexts = extraRecords(client.blobs(), 2).back();
+        ASSERT_TRUE(contexts.isArray());
+        ASSERT_EQ(contexts.array()->size(), 1U);
+        EXPECT_EQ(numberAt(contexts.array()->at(0), "Context ID"), 2);
+        EXPECT_EQ(textAt(contexts.array()->at(0), "APN"), "second.test");
+        EXPECT_EQ(textAt(contexts.array()->at(0), "PDP Address"), "10.45.18.1");
+        EXPECT_EQ(textAt(contexts.array()->at(0), "Interface"), "wwan2");
     }
     // A client that asks for the three extra records only.
     KxTestClient& extrasClient() {
@@ -124,14 +155,9 @@ TEST_F(ModemManagerLinkTest, SimFilesBearersAndCellsComeFromTheModemWhichMayGoAn
     ServiceProcess& service = startLive(address_);
     ASSERT_TRUE(service.waitForError(kUsing)) << service.errorOutput();
     KxTestClient& client = extrasClient();
-    ASSERT_TRUE(waitForRecords(client, 0, 1)) << service.errorOutput();
+    expectSim(client, service, kFirstSim);
     ASSERT_TRUE(waitForRecords(client, 2, 1)) << service.errorOutput();
     ASSERT_TRUE(waitForRecords(client, 1, 1)) << service.errorOutput();
-
-    const PlistValue sim = extraRecords(client.blobs(), 0).back();
-    EXPECT_EQ(textAt(sim, "kSimFile_ICCID"), "8900101234567890123");
-    EXPECT_EQ(textAt(sim, "kSimFile_IMSI"), "001010123456789");
-    EXPECT_EQ(textAt(sim, "kSimFile_MSISDN"), "+15555550123");
 
     const PlistValue contexts = extraRecords(client.blobs(), 2).back();
     ASSERT_TRUE(contexts.isArray());
@@ -185,8 +211,7 @@ TEST_F(ModemManagerLinkTest, ModemManagerAbsentAtStartIsPickedUpWhenItAppears) {
     KxTestClient& client = extrasClient();
     startFakeModemManager();
     ASSERT_TRUE(service.waitForError(kUsing)) << service.errorOutput();
-    ASSERT_TRUE(waitForRecords(client, 0, 1)) << service.errorOutput();
-    EXPECT_EQ(textAt(extraRecords(client.blobs(), 0).back(), "kSimFile_ICCID"), "8900101234567890123");
+    expectSim(client, service, kFirstSim);
 }
 
 TEST_F(ModemManagerLinkTest, NoBusIsOneNoticeAndTheDiagnosticPortStillServes) {
@@ -221,6 +246,112 @@ TEST_F(ModemManagerLinkTest, TheBusGoingAwayIsOneNoticeAndTheServiceGoesOn) {
     queue_.cancelTimer(tick);
     EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: no bus"), 1U) << service.errorOutput();
     EXPECT_FALSE(service.waitForExit(0).has_value());
+}
+
+TEST_F(ModemManagerLinkTest, ModemChosenByObjectPathAmongTwo) {
+    startFakeModemManager({"--two-modems"});
+    ServiceProcess& service = startLive(address_, {"--modem", "/org/freedesktop/ModemManager1/Modem/1"});
+    ASSERT_TRUE(service.waitForError(kUsingSecond)) << service.errorOutput();
+    expectSecondModemsRecords(extrasClient(), service);
+    EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: using modem"), 1U) << service.errorOutput();
+}
+
+TEST_F(ModemManagerLinkTest, ModemChosenByIndexAmongTwo) {
+    startFakeModemManager({"--two-modems"});
+    ServiceProcess& service = startLive(address_, {"--modem", "1"});
+    ASSERT_TRUE(service.waitForError(kUsingSecond)) << service.errorOutput();
+    expectSecondModemsRecords(extrasClient(), service);
+}
+
+TEST_F(ModemManagerLinkTest, ModemChosenByIndexZeroIsTheFirst) {
+    startFakeModemManager({"--two-modems"});
+    ServiceProcess& service = startLive(address_, {"--modem", "0"});
+    ASSERT_TRUE(service.waitForError(kUsing)) << service.errorOutput();
+    expectSim(extrasClient(), service, kFirstSim);
+}
+
+TEST_F(ModemManagerLinkTest, AnUnknownModemPathIsOneNoticeAndNoRecords) {
+    startFakeModemManager({"--two-modems"});
+    ServiceProcess& service = startLive(address_, {"--modem", "/org/freedesktop/ModemManager1/Modem/7"});
+    ASSERT_TRUE(service.waitForError("<5> modem-manager: no modem /org/freedesktop/ModemManager1/Modem/7; " +
+                                     kOff + " one appears\n"))
+        << service.errorOutput();
+    KxTestClient& client = newClient();
+    ASSERT_TRUE(client.start({0xB0C2, 0xB0C1}, {0, 1, 2})) << client.error();
+    const MainQueue::Handle tick = queue_.repeating(0.01, [] {});
+    EXPECT_TRUE(runUntil([&] { return client.blobs().size() >= 3; })) << service.errorOutput();
+    // A change on the bus reads the objects again: still no such modem, and no second notice.
+    fake_->sendSignal(SIGUSR1);
+    ASSERT_TRUE(fake_->waitForOutput(
+        [](const std::string& out) { return out.find("removed\n") != std::string::npos; }, kWaitSeconds));
+    queue_.runFor(0.3);
+    queue_.cancelTimer(tick);
+    for (const std::uint16_t code : {0, 1, 2}) {
+        EXPECT_TRUE(extraRecords(client.blobs(), code).empty()) << code;
+    }
+    EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: no modem"), 1U) << service.errorOutput();
+    EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: using modem"), 0U) << service.errorOutput();
+}
+
+TEST_F(ModemManagerLinkTest, AnUnknownModemIndexIsOneNotice) {
+    startFakeModemManager({"--two-modems"});
+    ServiceProcess& service = startLive(address_, {"--modem", "12"});
+    ASSERT_TRUE(service.waitForError("<5> modem-manager: no modem 12; " + kOff + " one appears\n"))
+        << service.errorOutput();
+    EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: using modem"), 0U) << service.errorOutput();
+}
+
+TEST_F(ModemManagerLinkTest, OfTwoModemsTheOneOwningTheDiagnosticPortIsChosen) {
+    // ModemManager names a port by its device name: the last part of the pty the link leads to.
+    char* real = realpath(files_.file("modem").c_str(), nullptr);
+    ASSERT_NE(real, nullptr);
+    const std::string device = real;
+    std::free(real);  // NOLINT(cppcoreguidelines-no-malloc): realpath allocates with malloc
+    startFakeModemManager({"--two-modems", "--port", device.substr(device.rfind('/') + 1)});
+    ServiceProcess& service = startLive(address_);
+    ASSERT_TRUE(service.waitForError(kUsingSecond)) << service.errorOutput();
+    expectSecondModemsRecords(extrasClient(), service);
+}
+
+TEST_F(ModemManagerLinkTest, OfTwoModemsNoneOwningTheDiagnosticPortNoneIsGuessed) {
+    startFakeModemManager({"--two-modems"});
+    ServiceProcess& service = startLive(address_);
+    ASSERT_TRUE(service.waitForError(
+        "<5> modem-manager: 2 modems and none owns the diagnostic port; choose one with --modem\n"))
+        << service.errorOutput();
+    KxTestClient& client = newClient();
+    ASSERT_TRUE(client.start({0xB0C2, 0xB0C1}, {0, 1, 2})) << client.error();
+    const MainQueue::Handle tick = queue_.repeating(0.01, [] {});
+    EXPECT_TRUE(runUntil([&] { return client.blobs().size() >= 3; })) << service.errorOutput();
+    queue_.cancelTimer(tick);
+    EXPECT_TRUE(extraRecords(client.blobs(), 0).empty());
+    EXPECT_TRUE(extraRecords(client.blobs(), 2).empty());
+    EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: using modem"), 0U) << service.errorOutput();
+}
+
+TEST_F(ModemManagerLinkTest, AValueOfTheWrongTypeIsWarnedOnceAWindowNotAtEveryPoll) {
+    startFakeModemManager({"--wrong-types"});
+    ServiceProcess& service = startLive(address_, {}, {"VELMAR_MODEM_MANAGER_CELL_SECONDS=0.05"});
+    ASSERT_TRUE(service.waitForError(kUsing)) << service.errorOutput();
+    KxTestClient& client = extrasClient();
+    ASSERT_TRUE(waitForRecords(client, 1, 5)) << service.errorOutput();
+    const std::string log = service.errorOutput();
+    EXPECT_EQ(
+        occurrences(log, "<4> modem-manager: cell 1: earfcn is not an integer (D-Bus type 's'); skipped\n"),
+        1U)
+        << log;
+    EXPECT_EQ(
+        occurrences(log, "<4> modem-manager: cell 2: earfcn is not an integer (D-Bus type 's'); skipped\n"),
+        1U)
+        << log;
+    EXPECT_EQ(occurrences(log, "<4> modem-manager:"), 2U) << log;
+    // The neighbours are still sent, without the value that could not be trusted.
+    const PlistValue cells = extraRecords(client.blobs(), 1).back();
+    ASSERT_TRUE(cells.isArray());
+    ASSERT_EQ(cells.array()->size(), 3U);
+    EXPECT_EQ(numberAt(cells.array()->at(0), "kKxCellMonitorUARFCN"), 1300);
+    EXPECT_EQ(numberAt(cells.array()->at(1), "kKxCellMonitorPID"), 0x20);
+    EXPECT_EQ(numberAt(cells.array()->at(1), "kKxCellMonitorUARFCN"), -1);
 }
 
 }  // namespace
