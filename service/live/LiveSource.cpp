@@ -84,7 +84,9 @@ void LiveSource::start(MainQueue& queue, BlobSink& sink) {
     });
     if (settings_.modemManager && !modemManager_) {
         modemManager_ = std::make_unique<modem::ModemManagerLink>(
-            *settings_.modemManager, queue, sink, [this] { return port_ ? portName_ : std::string(); });
+            *settings_.modemManager, queue, sink,
+            // A candidate that "auto" is still probing is not the diagnostic port yet.
+            [this] { return port_ && !probing_ ? portName_ : std::string(); });
     }
     if (modemManager_) {
         modemManager_->start();
@@ -270,6 +272,9 @@ void LiveSource::ready() {
     if (away_) {
         away_ = false;
         SystemLog::log(kLogNotice, "live: %s: the device is back", portName_.c_str());
+    }
+    if (modemManager_) {
+        modemManager_->diagnosticPortChanged();
     }
 }
 

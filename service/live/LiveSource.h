@@ -23,7 +23,8 @@
 //   described, the others summed up). Bytes are read kReadSize at a time, at most
 //   kReadsPerWake reads per wake-up, so a flood never starves the channels and the control port.
 // - With Settings::modemManager, a ModemManagerLink supplies the extra records beside the port, told of the
-//   port in use (to find its modem) and of every change of the channels' demand.
+//   port in use (to find its modem: a port that answers, never a candidate still probed) and of every
+//   change of the channels' demand.
 // - finish(done) sends the stop sequence (logging off) and runs done; stop() closes everything, writing the
 //   stop sequence at once if finish() did not run.
 #pragma once

@@ -125,6 +125,12 @@ void ModemManagerLink::demandChanged() {
     wantedCells_ = cells;
 }
 
+void ModemManagerLink::diagnosticPortChanged() {
+    if (running_ && bus_.isOpen()) {
+        scheduleRefresh();
+    }
+}
+
 void ModemManagerLink::enter(State state, const std::string& detail) {
     // One notice per state: an absence that goes on for another reason (the bus lost, then not found) is
     // not news; another modem in use is.

@@ -8,7 +8,8 @@
 // - The modem is the one named by Settings::modem (an object path, or the number that ends it), else the
 //   one whose ports include the diagnostic port in use, else the only one. Its objects are read with
 //   GetManagedObjects and the SIM's and bearers' properties with GetAll, again whenever ModemManager says a
-//   modem, SIM or bearer changed (InterfacesAdded/Removed, PropertiesChanged) or its name changes owner.
+//   modem, SIM or bearer changed (InterfacesAdded/Removed, PropertiesChanged), its name changes owner or a
+//   diagnostic port begins to answer.
 // - 0xFF0000 and 0xFF0002 go out when they change and whenever a channel starts asking for their code;
 //   0xFF0001 is asked for (GetCellInfo) every cellInfoSeconds while a channel asks for it. Every record goes
 //   only to the channels whose start command names its extra code (the sink filters).
@@ -54,6 +55,9 @@ class ModemManagerLink {
     void stop();
     // The channels' demand may have changed: records newly asked for go out now.
     void demandChanged();
+    // A diagnostic port has begun to answer (found, or back): the modem is chosen again, since the one
+    // that owns the port may be another.
+    void diagnosticPortChanged();
 
     static constexpr std::size_t kProblemsPerWindow = 5;
     static constexpr std::chrono::seconds kProblemWindow{60};

@@ -16,6 +16,7 @@
 #include "core/platform/plist/PlistCodec.h"
 #include "service/BasebandBlob.h"
 #include "tests/support/BackgroundProcess.h"
+#include "tests/support/LiveModem.h"
 #include "tests/support/ServiceTestFixture.h"
 #include "tools/modem-emulator/ModemEmulator.h"
 
@@ -47,6 +48,17 @@ std::vector<PlistValue> extraRecords(const std::vector<PlistData>& blobs, std::u
         }
     }
     return records;
+}
+
+// ModemManager names a port by its device name: the last part of the path that link leads to.
+std::string deviceName(const std::string& link) {
+    char* real = realpath(link.c_str(), nullptr);
+    if (real == nullptr) {
+        return "(no device)";
+    }
+    const std::string device = real;
+    std::free(real);  // NOLINT(cppcoreguidelines-no-malloc): realpath allocates with malloc
+    return device.substr(device.rfind('/') + 1);
 }
 
 std::string textAt(const PlistValue& dictionary, const std::string& key) {
@@ -311,15 +323,36 @@ TEST_F(ModemManagerLinkTest, AnUnknownModemIndexIsOneNotice) {
 }
 
 TEST_F(ModemManagerLinkTest, OfTwoModemsTheOneOwningTheDiagnosticPortIsChosen) {
-    // ModemManager names a port by its device name: the last part of the pty the link leads to.
-    char* real = realpath(files_.file("modem").c_str(), nullptr);
-    ASSERT_NE(real, nullptr);
-    const std::string device = real;
-    std::free(real);  // NOLINT(cppcoreguidelines-no-malloc): realpath allocates with malloc
-    startFakeModemManager({"--two-modems", "--port", device.substr(device.rfind('/') + 1)});
+    startFakeModemManager({"--two-modems", "--port", deviceName(files_.file("modem"))});
     ServiceProcess& service = startLive(address_);
     ASSERT_TRUE(service.waitForError(kUsingSecond)) << service.errorOutput();
     expectSecondModemsRecords(extrasClient(), service);
+}
+
+TEST_F(ModemManagerLinkTest, TheModemOfAPortThatAutoFindsAfterTheModemsWereReadIsChosenThen) {
+    // "auto" first probes a silent candidate, long enough for the modems to be read while no port answers.
+    TemporaryDirectory root;
+    FakeSysfs sysfs(root.path());
+    sysfs.addUsbSerialPort({"ttyUSB3", 3, 0xFF, 0xFF, 0x30, "2c7c", "0800", ""});
+    sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0xFF, "abcd", "0002", ""});
+    ModemEmulator silent(ModemEmulator::Settings{"", 0, sysfs.devicePath("ttyUSB3"), {}, false, false});
+    std::string error;
+    ASSERT_TRUE(silent.start(error)) << error;
+    silent.setSilent(true);
+    ModemEmulator::Settings settings;
+    settings.capturePath = samplePath("lte-connected-1.qmdl");
+    settings.packetsPerSecond = 50;
+    settings.linkPath = sysfs.devicePath("ttyUSB0");
+    ModemEmulator modem(settings);
+    ASSERT_TRUE(modem.start(error)) << error;
+    startFakeModemManager({"--two-modems", "--port", deviceName(sysfs.devicePath("ttyUSB0"))});
+    ServiceProcess& service =
+        startService({"--source", "live", "--device", "auto", "--bus-address", address_},
+                     {"VELMAR_DIAG_RESPONSE_SECONDS=0.2", "VELMAR_MODEM_MANAGER_RETRY_SECONDS=0.2",
+                      "VELMAR_SYSROOT=" + root.path()});
+    ASSERT_TRUE(service.waitForError(kUsingSecond)) << service.errorOutput();
+    expectSecondModemsRecords(extrasClient(), service);
+    EXPECT_EQ(occurrences(service.errorOutput(), "modem-manager: using modem"), 1U) << service.errorOutput();
 }
 
 TEST_F(ModemManagerLinkTest, OfTwoModemsNoneOwningTheDiagnosticPortNoneIsGuessed) {
