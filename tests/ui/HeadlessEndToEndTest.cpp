@@ -90,6 +90,34 @@ class HeadlessEndToEndTest : public ::testing::Test {
         return std::make_unique<testing::BackgroundProcess>(
             VELMAR_PATH, std::vector<std::string>{"--headless", "--log-stderr"}, directory, environment());
     }
+    void TearDown() override { unsetenv("VELMAR_RUNTIME_DIR"); }
+
+    // A modem on a pseudo-terminal reached through linkPath, streaming the LTE capture at packetsPerSecond.
+    static std::unique_ptr<testing::ModemEmulator> startLteModem(const std::string& linkPath,
+                                                                 double packetsPerSecond) {
+        testing::ModemEmulator::Settings settings;
+        settings.capturePath = std::string(VELMAR_SOURCE_DIR) + "/samples/captures/lte-connected-1.qmdl";
+        settings.linkPath = linkPath;
+        settings.packetsPerSecond = packetsPerSecond;
+        auto modem = std::make_unique<testing::ModemEmulator>(settings);
+        std::string error;
+        EXPECT_TRUE(modem->start(error)) << error;
+        return modem;
+    }
+    // kxserverd --source live with arguments and the extra assignments, its notice lines on its standard
+    // error, in this test's runtime directory; this process uses that directory too (to talk to the service
+    // as a second monitor) until the test ends.
+    std::unique_ptr<testing::ServiceProcess> startLiveService(
+        const std::vector<std::string>& arguments, const std::vector<std::string>& assignments = {}) {
+        std::vector<std::string> all = {"--source", "live"};
+        all.insert(all.end(), arguments.begin(), arguments.end());
+        all.push_back("--log-stderr");
+        std::vector<std::string> serviceEnvironment = environment();
+        serviceEnvironment.push_back("VELMAR_LOG_LEVEL=notice");
+        serviceEnvironment.insert(serviceEnvironment.end(), assignments.begin(), assignments.end());
+        setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
+        return std::make_unique<testing::ServiceProcess>(all, outputs_.path(), serviceEnvironment);
+    }
 
     testing::TemporaryDirectory runtime_;
     testing::TemporaryDirectory config_;
@@ -398,26 +426,13 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
     testing::TemporaryDirectory root;
     testing::FakeSysfs sysfs(root.path());
     sysfs.addUsbSerialPort({"ttyUSB0", 0, 0xFF, 0xFF, 0x30, "abcd", "0003", "usb-Maker_Modem_7-if00-port0"});
-    testing::ModemEmulator::Settings settings;
-    settings.capturePath = std::string(VELMAR_SOURCE_DIR) + "/samples/captures/lte-connected-1.qmdl";
-    settings.linkPath = sysfs.devicePath("ttyUSB0");
     // A pace that a monitor built with sanitizers decodes on a busy machine: each of these packets lists
     // dozens of neighbour cells.
-    settings.packetsPerSecond = 20;
-    testing::ModemEmulator modem(settings);
-    std::string error;
-    ASSERT_TRUE(modem.start(error)) << error;
-    std::vector<std::string> serviceEnvironment = environment();
-    serviceEnvironment.push_back("VELMAR_SYSROOT=" + root.path());
-    serviceEnvironment.push_back("VELMAR_LOG_LEVEL=notice");
-    // This process talks to the service too (as a second monitor): in the same runtime directory.
-    setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
-    struct Unset {
-        ~Unset() { unsetenv("VELMAR_RUNTIME_DIR"); }
-    } unset;
-    testing::ServiceProcess service(
-        {"--source", "live", "--device", "auto", "--modem-manager", "off", "--log-stderr"}, outputs_.path(),
-        serviceEnvironment);
+    const std::unique_ptr<testing::ModemEmulator> modem = startLteModem(sysfs.devicePath("ttyUSB0"), 20);
+    ASSERT_FALSE(::testing::Test::HasFailure());
+    const std::unique_ptr<testing::ServiceProcess> running =
+        startLiveService({"--device", "auto", "--modem-manager", "off"}, {"VELMAR_SYSROOT=" + root.path()});
+    testing::ServiceProcess& service = *running;
     ASSERT_TRUE(service.waitUntilServing(30)) << service.errorOutput();
     testing::TemporaryDirectory monitorOutputs;
     auto monitor = startMonitor(monitorOutputs.path());
@@ -435,9 +450,9 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
         return false;
     };
     ASSERT_TRUE(monitor->waitForOutput(showsTheCapture, 30))
-        << modem.packetsStreamed() << " packets streamed\n"
+        << modem->packetsStreamed() << " packets streamed\n"
         << service.errorOutput() << monitor->errorOutput();
-    EXPECT_EQ(modem.enabledCodes(), lteCodes);
+    EXPECT_EQ(modem->enabledCodes(), lteCodes);
 
     // A second monitor joins with another code, then leaves: the masks follow.
     PollMainQueue queue;
@@ -448,19 +463,19 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
         ASSERT_TRUE(second.start({0xB193}, {}));
         Codes both = lteCodes;
         both.insert(0xB193);
-        EXPECT_TRUE(queue.runUntil([&] { return modem.enabledCodes() == both; }, 30));
+        EXPECT_TRUE(queue.runUntil([&] { return modem->enabledCodes() == both; }, 30));
         EXPECT_TRUE(queue.runUntil([&] { return second.blobs().size() >= 5; }, 30));
         second.disconnect();
-        EXPECT_TRUE(queue.runUntil([&] { return modem.enabledCodes() == lteCodes; }, 30));
+        EXPECT_TRUE(queue.runUntil([&] { return modem->enabledCodes() == lteCodes; }, 30));
     }
     queue.cancelTimer(tick);
 
     // Unplugged and plugged in again: the service heals by itself and the monitor goes on.
-    modem.vanish();
+    modem->vanish();
     ASSERT_TRUE(service.waitForError(": the device went away (", 10)) << service.errorOutput();
     const std::size_t linesBefore = testing::linesOf(monitor->standardOutput()).size();
-    ASSERT_TRUE(modem.comeBack());
-    EXPECT_TRUE(testing::waitUntil([&] { return modem.enabledCodes() == lteCodes; }, 3.0))
+    ASSERT_TRUE(modem->comeBack());
+    EXPECT_TRUE(testing::waitUntil([&] { return modem->enabledCodes() == lteCodes; }, 3.0))
         << service.errorOutput();
     EXPECT_TRUE(monitor->waitForOutput(
         [&](const std::string& out) {
@@ -475,8 +490,8 @@ TEST_F(HeadlessEndToEndTest, ALiveModemFoundByItselfGivesALivingMonitorThatSurvi
     // SIGTERM leaves the modem with logging off.
     service.sendSignal(SIGTERM);
     EXPECT_EQ(service.waitForExit(10), std::optional<int>(0));
-    EXPECT_TRUE(modem.enabledCodes().empty());
-    const std::vector<PlistData> requests = modem.requests();
+    EXPECT_TRUE(modem->enabledCodes().empty());
+    const std::vector<PlistData> requests = modem->requests();
     ASSERT_GE(requests.size(), 3U);
     EXPECT_EQ(testing::hexOf(requests[requests.size() - 3]), "73 00 00 00 00 00 00 00");
     EXPECT_EQ(testing::hexOf(requests[requests.size() - 2]), "60 00");
@@ -541,23 +556,12 @@ TEST_F(HeadlessEndToEndTest, ModemManagerFillsTheSimContextsAndCellMonitorKeys) 
     ASSERT_TRUE(fake.waitForOutput(
         [](const std::string& out) { return out.find("ready\n") != std::string::npos; }, 30))
         << fake.errorOutput();
-    testing::ModemEmulator::Settings settings;
-    settings.capturePath = std::string(VELMAR_SOURCE_DIR) + "/samples/captures/lte-connected-1.qmdl";
-    settings.linkPath = files.path() + "/modem";
-    settings.packetsPerSecond = 20;
-    testing::ModemEmulator modem(settings);
-    std::string error;
-    ASSERT_TRUE(modem.start(error)) << error;
-    std::vector<std::string> serviceEnvironment = environment();
-    serviceEnvironment.push_back("VELMAR_LOG_LEVEL=notice");
-    // This process looks for the service's port: in the same runtime directory.
-    setenv("VELMAR_RUNTIME_DIR", runtime_.path().c_str(), 1);
-    struct Unset {
-        ~Unset() { unsetenv("VELMAR_RUNTIME_DIR"); }
-    } unset;
-    testing::ServiceProcess service(
-        {"--source", "live", "--device", settings.linkPath, "--bus-address", address, "--log-stderr"},
-        outputs_.path(), serviceEnvironment);
+    const std::string modemLink = files.path() + "/modem";
+    const std::unique_ptr<testing::ModemEmulator> modem = startLteModem(modemLink, 20);
+    ASSERT_FALSE(::testing::Test::HasFailure());
+    const std::unique_ptr<testing::ServiceProcess> running =
+        startLiveService({"--device", modemLink, "--bus-address", address});
+    testing::ServiceProcess& service = *running;
     ASSERT_TRUE(service.waitUntilServing(30)) << service.errorOutput();
     auto monitor = startMonitor(files.path());
 
