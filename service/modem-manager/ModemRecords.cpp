@@ -9,6 +9,7 @@
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/records/LteRecords.h"
 #include "logfile/records/RecordBuilder.h"
+#include "service/modem-manager/LteBandOfEarfcn.h"
 
 namespace velmar::modem {
 
@@ -305,6 +306,8 @@ PlistValue cellMonitorFrom(const std::vector<BusDictionary>& cells, std::vector<
                 cell.cellId = reader.hexadecimal("ci", 0xFFFFFFF);
                 cell.physicalCellId = reader.hexadecimal("physical-ci", 503);
                 cell.uarfcn = reader.number("earfcn", 0, 262143);
+                // The cell list names no band; the EARFCN's downlink range gives it.
+                cell.bandInfo = cell.uarfcn ? lteBandOfEarfcn(*cell.uarfcn) : std::nullopt;
                 array->append(lteCellMonitorDictionary(cell));
                 break;
             }

@@ -13,7 +13,8 @@
 //   the bearer's object path, APN and IP type from its "Properties", address from Ip4Config (else Ip6Config),
 //   DNS servers and the network interface when the bearer names them.
 // - cellMonitorFrom: one dictionary per GSM, UMTS or LTE cell of GetCellInfo, in the order given; cells of
-//   other technologies have no cell-monitor form and are left out silently.
+//   other technologies have no cell-monitor form and are left out silently. An LTE cell's band is the band
+//   whose downlink range holds its EARFCN.
 #pragma once
 
 #include <optional>

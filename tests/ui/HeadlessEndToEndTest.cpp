@@ -587,10 +587,12 @@ TEST_F(HeadlessEndToEndTest, ModemManagerFillsTheSimContextsAndCellMonitorKeys) 
                     seen.insert("uarfcn");
                 } else if (path.ends_with("Serving Cell Info/Tracking Area Code") && value == "6699") {
                     seen.insert("tac");
+                } else if (path.ends_with("Serving Cell Info/Freq Band Indicator") && value == "3") {
+                    seen.insert("band");
                 }
             }
         }
-        return seen.size() == 6;
+        return seen.size() == 7;
     };
     ASSERT_TRUE(monitor->waitForOutput(showsAll, 30))
         << "seen: "
