@@ -20,9 +20,21 @@ std::string ORVLogGenerator::dlfVersionText(const std::optional<std::string>& ap
 }
 
 PlistDataRef ORVLogGenerator::takeBinData() {
+    if (!_gathersRawBlobs) {
+        return std::make_shared<PlistData>();
+    }
     PlistDataRef taken = std::move(_binData);
     _binData = std::make_shared<PlistData>();
     return taken;
+}
+
+void ORVLogGenerator::setGathersRawBlobs(bool gathers) {
+    _gathersRawBlobs = gathers;
+    if (!gathers) {
+        _binData = nullptr;
+    } else if (!_binData) {
+        _binData = std::make_shared<PlistData>();
+    }
 }
 
 PlistDataRef ORVLogGenerator::generateDlfFromState(const StateDict& state) {

@@ -19,6 +19,12 @@ class ORVLogGenerator : public LogGenerator {
     // The DLF file of the state's history, or null (logged with priority 16) when it cannot be built.
     PlistDataRef generateDlfFromState(const StateDict& state);
 
+    // Whether the raw blobs of each interval are gathered (the default). A reader that shows only the display
+    // turns this off, so that an interval of any length (a whole recording decoded in one refresh) holds no
+    // copy of its blobs; the display does not depend on them, the history entries' "DisplayState" and the
+    // save contents do (they then hold no blobs).
+    void setGathersRawBlobs(bool gathers);
+
     // "Velmar <version>" when the application has a version string, else "(none)".
     static std::string dlfVersionText(const std::optional<std::string>& applicationVersion);
 
@@ -33,6 +39,9 @@ class ORVLogGenerator : public LogGenerator {
     PlistDataRef takeBinData();
 
     PlistDataRef _binData;
+
+  private:
+    bool _gathersRawBlobs = true;
 };
 
 }  // namespace velmar

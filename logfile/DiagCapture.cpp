@@ -1,16 +1,38 @@
 #include "logfile/DiagCapture.h"
 
-#include "core/platform/WholeFile.h"
 #include "logfile/DiagStreamDeframer.h"
+#include "logfile/LogByteStream.h"
 
 namespace velmar {
 
-bool scanDiagCaptureBytes(std::span<const std::uint8_t> bytes, const std::string& name,
-                          const LogItemCallback& callback, std::string& /*error*/, LogReadStats* stats) {
+bool scanDiagCaptureStream(LogByteStream& stream, const std::string& name, const LogItemCallback& callback,
+                           std::string& error, LogReadStats* stats) {
     DiagStreamDeframer deframer(name, callback, stats);
-    deframer.feed(bytes);
+    deframer.stopAtOverlongFrame();
+    while (!deframer.stopped()) {
+        if (!stream.fill(1, name, error)) {
+            return false;
+        }
+        const std::span<const std::uint8_t> bytes = stream.available();
+        if (bytes.empty()) {
+            break;
+        }
+        deframer.feed(bytes);
+        stream.consume(bytes.size());
+    }
+    if (const std::optional<std::uint64_t> at = deframer.overlongFrameAt()) {
+        error = name + ": offset " + std::to_string(*at) + ": frame longer than " +
+                std::to_string(kMaxDiagFrameBytes) + " bytes";
+        return false;
+    }
     deframer.finish();
     return true;
+}
+
+bool scanDiagCaptureBytes(std::span<const std::uint8_t> bytes, const std::string& name,
+                          const LogItemCallback& callback, std::string& error, LogReadStats* stats) {
+    LogByteStream stream(bytes);
+    return scanDiagCaptureStream(stream, name, callback, error, stats);
 }
 
 LogReadResult parseDiagCaptureBytes(std::span<const std::uint8_t> bytes, const std::string& name) {
@@ -21,12 +43,8 @@ LogReadResult parseDiagCaptureBytes(std::span<const std::uint8_t> bytes, const s
 
 bool forEachDiagCaptureItem(const std::string& path, const LogItemCallback& callback, std::string& error,
                             LogReadStats* stats) {
-    PlistData bytes;
-    if (const FileOutcome read = readWholeFile(path, bytes); !read.ok()) {
-        error = read.message(path);
-        return false;
-    }
-    return scanDiagCaptureBytes(bytes, path, callback, error, stats);
+    LogByteStream stream;
+    return stream.open(path, error) && scanDiagCaptureStream(stream, path, callback, error, stats);
 }
 
 LogReadResult readDiagCapture(const std::string& path) {

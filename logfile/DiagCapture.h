@@ -5,7 +5,8 @@
 // past the frame's end) is counted as bad and skipped: captures from real phones hold a few of those and the
 // rest of the stream is still good. Empty frames (0x7E 0x7E) are ignored; frames other than log packets
 // (command replies) are counted as "other" and skipped. Each blob's offset is where its frame starts in the
-// input. The only fatal error is an unreadable file.
+// input. The fatal errors are an unreadable file and a frame longer than kMaxDiagFrameBytes (a stream that
+// is not a capture, or an endless one without a 0x7E): "cap.qmdl: offset 0: frame longer than 262144 bytes".
 #pragma once
 
 #include <cstddef>
@@ -19,8 +20,13 @@
 
 namespace velmar {
 
-// Streams the log packets of a capture held in memory; name is used in messages. Fills the frame counters
-// of stats. Always answers true (damage is counted, not fatal).
+class LogByteStream;
+
+// Streams the log packets of a capture read through stream (DiagStreamDeframer fed chunk by chunk); name is
+// used in messages. Fills the frame counters of stats.
+bool scanDiagCaptureStream(LogByteStream& stream, const std::string& name, const LogItemCallback& callback,
+                           std::string& error, LogReadStats* stats = nullptr);
+// The same for a capture held in memory.
 bool scanDiagCaptureBytes(std::span<const std::uint8_t> bytes, const std::string& name,
                           const LogItemCallback& callback, std::string& error, LogReadStats* stats = nullptr);
 LogReadResult parseDiagCaptureBytes(std::span<const std::uint8_t> bytes, const std::string& name);

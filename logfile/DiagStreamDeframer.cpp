@@ -48,10 +48,9 @@ void DiagStreamDeframer::feed(std::span<const std::uint8_t> bytes) {
                 pendingStart_ = consumed_ + position;
             }
             if (pending_.size() + count > kMaxDiagFrameBytes) {
-                ++stats_->frames;
-                bad(pendingStart_, overlongReason());
+                overlong(pendingStart_);
                 pending_.clear();
-                overlong_ = true;
+                overlong_ = !stopped_;
                 break;
             }
             pending_.insert(pending_.end(), data + position, data + size);
@@ -63,8 +62,7 @@ void DiagStreamDeframer::feed(std::span<const std::uint8_t> bytes) {
         } else if (pending_.empty()) {
             frame(consumed_ + position, data + position, end - position);
         } else if (pending_.size() + (end - position) > kMaxDiagFrameBytes) {
-            ++stats_->frames;
-            bad(pendingStart_, overlongReason());
+            overlong(pendingStart_);
             pending_.clear();
         } else {
             pending_.insert(pending_.end(), data + position, data + end);
@@ -99,11 +97,11 @@ void DiagStreamDeframer::frame(std::uint64_t offset, const std::uint8_t* escaped
     if (size == 0) {
         return;  // an empty frame: 0x7E 0x7E
     }
-    ++stats_->frames;
     if (size > kMaxDiagFrameBytes) {
-        bad(offset, overlongReason());
+        overlong(offset);
         return;
     }
+    ++stats_->frames;
     std::size_t length = 0;
     if (!unescape(escaped, size, length)) {
         bad(offset, "escape byte 0x7D at the end of the frame");
@@ -181,6 +179,16 @@ void DiagStreamDeframer::handle(std::uint64_t offset, std::span<const std::uint8
     item.bytes = contents.blob;
     item.offset = offset;
     if (!callback_(item)) {
+        stopped_ = true;
+    }
+}
+
+// Counts a frame too long to hold as bad, and stops there when asked to.
+void DiagStreamDeframer::overlong(std::uint64_t offset) {
+    ++stats_->frames;
+    bad(offset, overlongReason());
+    if (stopAtOverlong_) {
+        overlongAt_ = offset;
         stopped_ = true;
     }
 }

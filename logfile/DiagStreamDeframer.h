@@ -12,7 +12,9 @@
 // - Bytes handed out are valid only during the call; an offset is where the frame starts in the stream
 //   (bytes fed so far). A sink or callback returning false stops the deframer: later bytes are ignored.
 // - A frame longer than kMaxDiagFrameBytes (escaped) is bad and skipped up to its 0x7E, so a stream that
-//   never ends a frame cannot make the deframer hold more than that.
+//   never ends a frame cannot make the deframer hold more than that. A file reader calls
+//   stopAtOverlongFrame(): such a frame then stops the deframer instead, and overlongFrameAt() says where it
+//   started, so that an endless run of bytes without a 0x7E ends the reading.
 // - finish() ends one input: bytes after the last 0x7E are a bad frame, and the bad frames beyond the first
 //   kMaxReportedProblems of this input are summed up in one warning. The deframer may then be fed a new
 //   input; its offsets keep counting.
@@ -20,6 +22,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <optional>
 #include <span>
 #include <string>
 
@@ -60,6 +63,10 @@ class DiagStreamDeframer {
     void setName(std::string name) { name_ = std::move(name); }
     void finish();
 
+    void stopAtOverlongFrame() { stopAtOverlong_ = true; }
+    // Where the frame that stopped the deframer for its length starts, if one did.
+    std::optional<std::uint64_t> overlongFrameAt() const { return overlongAt_; }
+
     bool stopped() const { return stopped_; }
     // Bytes fed so far.
     std::uint64_t consumed() const { return consumed_; }
@@ -72,6 +79,7 @@ class DiagStreamDeframer {
     void frame(std::uint64_t offset, const std::uint8_t* escaped, std::size_t size);
     bool unescape(const std::uint8_t* in, std::size_t size, std::size_t& length);
     void handle(std::uint64_t offset, std::span<const std::uint8_t> escaped, std::size_t length);
+    void overlong(std::uint64_t offset);
 
     std::string name_;
     LogItemCallback callback_;
@@ -85,6 +93,8 @@ class DiagStreamDeframer {
     std::uint64_t consumed_ = 0;
     std::uint64_t badHere_ = 0;  // bad frames of this input (stats_ may carry counts of earlier ones)
     bool stopped_ = false;
+    bool stopAtOverlong_ = false;
+    std::optional<std::uint64_t> overlongAt_;
 };
 
 }  // namespace velmar

@@ -6,47 +6,67 @@
 #include "core/platform/RecordReader.h"
 #include "core/platform/RecordWriter.h"
 #include "core/platform/WholeFile.h"
+#include "logfile/LogByteStream.h"
 
 namespace velmar {
 
-bool scanDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name,
-                  const LogItemCallback& callback, std::string& error, LogReadStats* stats) {
+bool scanDlfStream(LogByteStream& stream, const std::string& name, const LogItemCallback& callback,
+                   std::string& error, LogReadStats* stats) {
     PlistData blob;
     blob.reserve(1 + kDlfMaxRecordSize);
-    std::size_t offset = 0;
-    while (offset < bytes.size()) {
-        const std::size_t left = bytes.size() - offset;
+    while (true) {
+        if (!stream.fill(2, name, error)) {
+            return false;
+        }
+        std::span<const std::uint8_t> bytes = stream.available();
+        if (bytes.empty()) {
+            return true;
+        }
+        const std::uint64_t offset = stream.offset();
         const auto where = [&] { return name + ": offset " + std::to_string(offset) + ": "; };
-        if (left < 2) {
+        if (bytes.size() < 2) {
             error = where() + "1 trailing byte is too short for a record length";
             return false;
         }
-        const std::size_t length = RecordReader(bytes).u16(offset);
+        const std::size_t length = RecordReader(bytes).u16(0);
         if (length < kDlfHeaderSize) {
             error = where() + "record length " + std::to_string(length) + " is shorter than the " +
                     std::to_string(kDlfHeaderSize) + "-byte header";
             return false;
         }
-        if (length > left) {
+        if (!stream.fill(length, name, error)) {
+            return false;
+        }
+        bytes = stream.available();
+        if (length > bytes.size() && stream.ended()) {
             error = where() + "record length " + std::to_string(length) + " runs past the end of the file (" +
-                    std::to_string(left) + " bytes left)";
+                    std::to_string(bytes.size()) + " bytes left)";
+            return false;
+        }
+        if (length > bytes.size()) {
+            error = where() + "record length " + std::to_string(length) + " is longer than the " +
+                    std::to_string(stream.capacity()) + "-byte read window";
             return false;
         }
         blob.assign(1, kPlainLogType);
-        blob.insert(blob.end(), bytes.begin() + static_cast<std::ptrdiff_t>(offset),
-                    bytes.begin() + static_cast<std::ptrdiff_t>(offset + length));
+        blob.insert(blob.end(), bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(length));
         LogItemView item;
         item.bytes = blob;
         item.offset = offset;
         if (stats != nullptr) {
             ++stats->blobs;
         }
-        offset += length;
+        stream.consume(length);
         if (!callback(item)) {
             return true;
         }
     }
-    return true;
+}
+
+bool scanDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name,
+                  const LogItemCallback& callback, std::string& error, LogReadStats* stats) {
+    LogByteStream stream(bytes);
+    return scanDlfStream(stream, name, callback, error, stats);
 }
 
 LogReadResult parseDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name) {
@@ -57,12 +77,8 @@ LogReadResult parseDlfBytes(std::span<const std::uint8_t> bytes, const std::stri
 
 bool forEachDlfItem(const std::string& path, const LogItemCallback& callback, std::string& error,
                     LogReadStats* stats) {
-    PlistData bytes;
-    if (const FileOutcome read = readWholeFile(path, bytes); !read.ok()) {
-        error = read.message(path);
-        return false;
-    }
-    return scanDlfBytes(bytes, path, callback, error, stats);
+    LogByteStream stream;
+    return stream.open(path, error) && scanDlfStream(stream, path, callback, error, stats);
 }
 
 LogReadResult readDlfFile(const std::string& path) {

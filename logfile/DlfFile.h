@@ -22,7 +22,13 @@ namespace velmar {
 inline constexpr std::size_t kDlfHeaderSize = 12;
 inline constexpr std::size_t kDlfMaxRecordSize = 0xFFFF;
 
-// Streams the records of bytes as blobs (offset: where the record starts); name is used in messages.
+class LogByteStream;
+
+// Streams the records read through stream as blobs (offset: where the record starts); name is used in
+// messages. A record never needs more than kDlfMaxRecordSize bytes of the stream's window.
+bool scanDlfStream(LogByteStream& stream, const std::string& name, const LogItemCallback& callback,
+                   std::string& error, LogReadStats* stats = nullptr);
+// The same for records held in memory (offset: where the record starts); name is used in messages.
 bool scanDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name,
                   const LogItemCallback& callback, std::string& error, LogReadStats* stats = nullptr);
 LogReadResult parseDlfBytes(std::span<const std::uint8_t> bytes, const std::string& name);

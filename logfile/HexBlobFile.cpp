@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "core/platform/WholeFile.h"
+#include "logfile/LogByteStream.h"
 
 namespace velmar {
 
@@ -49,78 +50,98 @@ std::string_view trimmed(std::string_view text) {
 
 }  // namespace
 
-bool scanHexBlobText(std::string_view text, const std::string& name, const LogItemCallback& callback,
-                     std::string& error, LogReadStats* stats) {
+bool scanHexBlobStream(LogByteStream& stream, const std::string& name, const LogItemCallback& callback,
+                       std::string& error, LogReadStats* stats) {
     LogReadStats ignored;
     LogReadStats& counts = stats != nullptr ? *stats : ignored;
-    std::size_t start = 0;
-    if (text.starts_with("\xEF\xBB\xBF")) {
-        start = 3;
+    if (!stream.fill(3, name, error)) {
+        return false;
+    }
+    if (std::string_view(reinterpret_cast<const char*>(stream.available().data()), stream.available().size())
+            .starts_with("\xEF\xBB\xBF")) {
+        stream.consume(3);
     }
     PlistData blob;
     std::size_t lineNumber = 0;
-    while (start < text.size()) {
-        ++lineNumber;
-        std::size_t end = text.find('\n', start);
-        if (end == std::string_view::npos) {
-            end = text.size();
+    std::size_t searched = 0;  // bytes of the pending line already searched for its end
+    while (true) {
+        const std::span<const std::uint8_t> bytes = stream.available();
+        const auto* newline = static_cast<const std::uint8_t*>(
+            bytes.size() > searched ? std::memchr(bytes.data() + searched, '\n', bytes.size() - searched)
+                                    : nullptr);
+        if (newline == nullptr && !stream.ended()) {
+            if (bytes.size() >= stream.capacity()) {
+                error = name + ":" + std::to_string(lineNumber + 1) + ": line longer than " +
+                        std::to_string(stream.capacity()) + " bytes";
+                return false;
+            }
+            searched = bytes.size();
+            if (!stream.fill(bytes.size() + 1, name, error)) {
+                return false;
+            }
+            continue;
         }
-        std::string_view line = text.substr(start, end - start);
-        const std::uint64_t lineOffset = start;
-        start = end + 1;
+        if (bytes.empty()) {
+            return true;
+        }
+        searched = 0;
+        const std::size_t length =
+            newline != nullptr ? static_cast<std::size_t>(newline - bytes.data()) : bytes.size();
+        std::string_view line(reinterpret_cast<const char*>(bytes.data()), length);
+        const std::uint64_t lineOffset = stream.offset();
+        ++lineNumber;
 
         if (const std::size_t hash = line.find('#'); hash != std::string_view::npos) {
             line = line.substr(0, hash);
         }
         line = trimmed(line);
-        if (line.empty()) {
-            continue;
-        }
         LogItemView item;
         item.line = lineNumber;
         item.offset = lineOffset;
         if (line == "tick") {
             item.kind = LogItem::Kind::Tick;
             ++counts.ticks;
-            if (!callback(item)) {
-                return true;
+        } else if (!line.empty()) {
+            blob.clear();
+            int high = -1;
+            std::size_t digits = 0;
+            for (const char c : line) {
+                if (isBlank(c)) {
+                    continue;
+                }
+                const int value = hexValue(c);
+                if (value < 0) {
+                    error = name + ":" + std::to_string(lineNumber) + ": invalid hex digit " + quoted(c);
+                    return false;
+                }
+                ++digits;
+                if (high < 0) {
+                    high = value;
+                } else {
+                    blob.push_back(static_cast<std::uint8_t>(high << 4 | value));
+                    high = -1;
+                }
             }
-            continue;
-        }
-
-        blob.clear();
-        blob.reserve(line.size() / 2);
-        int high = -1;
-        std::size_t digits = 0;
-        for (const char c : line) {
-            if (isBlank(c)) {
-                continue;
-            }
-            const int value = hexValue(c);
-            if (value < 0) {
-                error = name + ":" + std::to_string(lineNumber) + ": invalid hex digit " + quoted(c);
+            if (high >= 0) {
+                error = name + ":" + std::to_string(lineNumber) + ": odd number of hex digits (" +
+                        std::to_string(digits) + ")";
                 return false;
             }
-            ++digits;
-            if (high < 0) {
-                high = value;
-            } else {
-                blob.push_back(static_cast<std::uint8_t>(high << 4 | value));
-                high = -1;
-            }
+            item.bytes = blob;
+            ++counts.blobs;
         }
-        if (high >= 0) {
-            error = name + ":" + std::to_string(lineNumber) + ": odd number of hex digits (" +
-                    std::to_string(digits) + ")";
-            return false;
-        }
-        item.bytes = blob;
-        ++counts.blobs;
-        if (!callback(item)) {
+        // The line's text is not needed past this point: the blob is a copy.
+        stream.consume(length + (newline != nullptr ? 1 : 0));
+        if (!line.empty() && !callback(item)) {
             return true;
         }
     }
-    return true;
+}
+
+bool scanHexBlobText(std::string_view text, const std::string& name, const LogItemCallback& callback,
+                     std::string& error, LogReadStats* stats) {
+    LogByteStream stream(std::span(reinterpret_cast<const std::uint8_t*>(text.data()), text.size()));
+    return scanHexBlobStream(stream, name, callback, error, stats);
 }
 
 LogReadResult parseHexBlobText(std::string_view text, const std::string& name) {
@@ -131,13 +152,8 @@ LogReadResult parseHexBlobText(std::string_view text, const std::string& name) {
 
 bool forEachHexBlobItem(const std::string& path, const LogItemCallback& callback, std::string& error,
                         LogReadStats* stats) {
-    PlistData bytes;
-    if (const FileOutcome read = readWholeFile(path, bytes); !read.ok()) {
-        error = read.message(path);
-        return false;
-    }
-    const std::string_view text(reinterpret_cast<const char*>(bytes.data()), bytes.size());
-    return scanHexBlobText(text, path, callback, error, stats);
+    LogByteStream stream;
+    return stream.open(path, error) && scanHexBlobStream(stream, path, callback, error, stats);
 }
 
 LogReadResult readHexBlobFile(const std::string& path) {

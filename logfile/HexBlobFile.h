@@ -16,8 +16,14 @@
 
 namespace velmar {
 
-// Streams the items of hex text; name is the file name used in messages. Items carry their 1-based line
-// and the byte offset where their line starts.
+class LogByteStream;
+
+// Streams the items of hex text read through stream, a line at a time; a line longer than the stream's
+// window is an error ("big.hex:1: line longer than 1048576 bytes"). name is the file name used in messages.
+bool scanHexBlobStream(LogByteStream& stream, const std::string& name, const LogItemCallback& callback,
+                       std::string& error, LogReadStats* stats = nullptr);
+// Streams the items of hex text in memory; name is the file name used in messages. Items carry their 1-based
+// line and the byte offset where their line starts.
 bool scanHexBlobText(std::string_view text, const std::string& name, const LogItemCallback& callback,
                      std::string& error, LogReadStats* stats = nullptr);
 LogReadResult parseHexBlobText(std::string_view text, const std::string& name);

@@ -6,11 +6,10 @@
 #include <cstring>
 
 #include "core/platform/RecordReader.h"
-#include "core/platform/WholeFile.h"
-#include "core/platform/plist/PlistCodec.h"
 #include "logfile/DiagCapture.h"
 #include "logfile/DlfFile.h"
 #include "logfile/HexBlobFile.h"
+#include "logfile/LogByteStream.h"
 #include "logfile/SnapshotFile.h"
 
 namespace velmar {
@@ -149,69 +148,61 @@ std::optional<LogFormat> detectLogFormat(const std::string& path, std::string& e
     if (const std::optional<LogFormat> format = logFormatForExtension(path)) {
         return format;
     }
-    PlistData head;
-    if (const FileOutcome read = readWholeFile(path, head, kLogFormatProbeSize); !read.ok()) {
-        error = read.message(path);
+    LogByteStream stream(kLogFormatProbeSize);
+    if (!stream.open(path, error) || !stream.fill(kLogFormatProbeSize, path, error)) {
         return std::nullopt;
     }
-    return logFormatForContent(head);
+    return logFormatForContent(stream.available());
 }
 
-bool forEachLogItem(const std::string& path, LogFormat format, const LogItemCallback& callback,
-                    std::string& error, LogReadStats* stats) {
+bool forEachLogItemInStream(LogByteStream& stream, const std::string& name, LogFormat format,
+                            const LogItemCallback& callback, std::string& error, LogReadStats* stats) {
     if (format == LogFormat::Auto) {
-        const std::optional<LogFormat> detected = detectLogFormat(path, error);
-        if (!detected) {
-            return false;
-        }
-        format = *detected;
-    }
-    switch (format) {
-        case LogFormat::Hex:
-            return forEachHexBlobItem(path, callback, error, stats);
-        case LogFormat::Dlf:
-            return forEachDlfItem(path, callback, error, stats);
-        case LogFormat::DiagCapture:
-            return forEachDiagCaptureItem(path, callback, error, stats);
-        case LogFormat::Snapshot:
-            return forEachSnapshotItem(path, callback, error, stats);
-        case LogFormat::Auto:
-            break;
-    }
-    error = path + ": no reader for this format";
-    return false;
-}
-
-bool forEachLogItemInBytes(std::span<const std::uint8_t> bytes, const std::string& name, LogFormat format,
-                           const LogItemCallback& callback, std::string& error, LogReadStats* stats) {
-    if (format == LogFormat::Auto) {
-        format = logFormatForExtension(name).value_or(
-            logFormatForContent(bytes.first(std::min(bytes.size(), kLogFormatProbeSize))));
-    }
-    switch (format) {
-        case LogFormat::Hex:
-            return scanHexBlobText(
-                std::string_view(reinterpret_cast<const char*>(bytes.data()), bytes.size()), name, callback,
-                error, stats);
-        case LogFormat::Dlf:
-            return scanDlfBytes(bytes, name, callback, error, stats);
-        case LogFormat::DiagCapture:
-            return scanDiagCaptureBytes(bytes, name, callback, error, stats);
-        case LogFormat::Snapshot: {
-            std::string reason;
-            const std::optional<PlistValue> root = parsePropertyList(bytes, &reason);
-            if (!root || !root->isDictionary()) {
-                error =
-                    name + ": " + (reason.empty() ? std::string("not a property-list dictionary") : reason);
+        if (const std::optional<LogFormat> named = logFormatForExtension(name)) {
+            format = *named;
+        } else {
+            // Detection looks at the stream's first bytes, which the reader then reads again.
+            if (!stream.fill(kLogFormatProbeSize, name, error)) {
                 return false;
             }
-            return scanSnapshotValue(*root, name, callback, error, stats);
+            const std::span<const std::uint8_t> head = stream.available();
+            format = logFormatForContent(head.first(std::min(head.size(), kLogFormatProbeSize)));
         }
+    }
+    switch (format) {
+        case LogFormat::Hex:
+            return scanHexBlobStream(stream, name, callback, error, stats);
+        case LogFormat::Dlf:
+            return scanDlfStream(stream, name, callback, error, stats);
+        case LogFormat::DiagCapture:
+            return scanDiagCaptureStream(stream, name, callback, error, stats);
+        case LogFormat::Snapshot:
+            return scanSnapshotStream(stream, name, callback, error, stats);
         case LogFormat::Auto:
             break;
     }
     error = name + ": no reader for this format";
     return false;
+}
+
+bool forEachLogItem(const std::string& path, LogFormat format, const LogItemCallback& callback,
+                    std::string& error, LogReadStats* stats) {
+    LogByteStream stream;
+    if (const FileOutcome opened = stream.open(path); !opened.ok()) {
+        // A snapshot names its failure as the property-list reader does: "snap.velmar: Is a directory".
+        const bool snapshot =
+            format == LogFormat::Snapshot ||
+            (format == LogFormat::Auto && logFormatForExtension(path) == LogFormat::Snapshot);
+        error = snapshot ? path + ": " + opened.reason() : opened.message(path);
+        return false;
+    }
+    return forEachLogItemInStream(stream, path, format, callback, error, stats);
+}
+
+bool forEachLogItemInBytes(std::span<const std::uint8_t> bytes, const std::string& name, LogFormat format,
+                           const LogItemCallback& callback, std::string& error, LogReadStats* stats) {
+    LogByteStream stream(bytes);
+    return forEachLogItemInStream(stream, name, format, callback, error, stats);
 }
 
 LogReadResult readLogFile(const std::string& path, LogFormat format) {

@@ -34,10 +34,18 @@ LogFormat logFormatForContent(std::span<const std::uint8_t> head);
 // The extension's format, else the content's; nullopt with a message when the file cannot be read.
 std::optional<LogFormat> detectLogFormat(const std::string& path, std::string& error);
 
+class LogByteStream;
+
 // Reads path with the reader of format (detected first when Auto); see LogReadResult.h for the two forms.
+// The file is read once, through a LogByteStream: memory stays bounded whatever its size, and a pipe or FIFO
+// is read as it comes.
 bool forEachLogItem(const std::string& path, LogFormat format, const LogItemCallback& callback,
                     std::string& error, LogReadStats* stats = nullptr);
 LogReadResult readLogFile(const std::string& path, LogFormat format = LogFormat::Auto);
+// The same for any stream; name stands for the input in messages and its extension counts for Auto.
+bool forEachLogItemInStream(LogByteStream& stream, const std::string& name, LogFormat format,
+                            const LogItemCallback& callback, std::string& error,
+                            LogReadStats* stats = nullptr);
 // The same for bytes already in memory (a pipe read to its end); name stands for the file in messages and its
 // extension counts for Auto.
 bool forEachLogItemInBytes(std::span<const std::uint8_t> bytes, const std::string& name, LogFormat format,

@@ -4,6 +4,7 @@
 #include "core/platform/SystemLog.h"
 #include "core/platform/plist/PlistCodec.h"
 #include "logfile/DlfFile.h"
+#include "logfile/LogByteStream.h"
 
 namespace velmar {
 
@@ -106,18 +107,45 @@ LogReadResult parseSnapshotValue(const PlistValue& root, const std::string& name
     });
 }
 
-bool forEachSnapshotItem(const std::string& path, const LogItemCallback& callback, std::string& error,
-                         LogReadStats* stats) {
-    std::string reason;
-    const std::optional<PlistValue> root = readDictionaryFile(path, &reason);
-    if (!root) {
-        if (reason.empty()) {
-            reason = "not a property-list dictionary";
+bool scanSnapshotStream(LogByteStream& stream, const std::string& name, const LogItemCallback& callback,
+                        std::string& error, LogReadStats* stats) {
+    // A property list parses only whole: gather it, up to the limit.
+    PlistData whole;
+    while (true) {
+        if (!stream.fill(1)) {
+            error = name + ": " + stream.failure().reason();
+            return false;
         }
-        error = reason.starts_with(path + ":") ? reason : path + ": " + reason;
+        const std::span<const std::uint8_t> bytes = stream.available();
+        if (bytes.empty()) {
+            break;
+        }
+        if (whole.size() + bytes.size() > kMaxSnapshotBytes) {
+            error = name + ": larger than " + std::to_string(kMaxSnapshotBytes / (1024 * 1024)) +
+                    " MiB, more than a snapshot holds";
+            return false;
+        }
+        whole.insert(whole.end(), bytes.begin(), bytes.end());
+        stream.consume(bytes.size());
+    }
+    std::string reason;
+    const std::optional<PlistValue> root = parsePropertyList(whole, &reason);
+    whole = PlistData();
+    if (!root) {
+        error = name + ": " + (reason.empty() ? std::string("not a property list") : reason);
         return false;
     }
-    return scanSnapshotValue(*root, path, callback, error, stats);
+    return scanSnapshotValue(*root, name, callback, error, stats);
+}
+
+bool forEachSnapshotItem(const std::string& path, const LogItemCallback& callback, std::string& error,
+                         LogReadStats* stats) {
+    LogByteStream stream;
+    if (const FileOutcome opened = stream.open(path); !opened.ok()) {
+        error = path + ": " + opened.reason();
+        return false;
+    }
+    return scanSnapshotStream(stream, path, callback, error, stats);
 }
 
 LogReadResult readSnapshotFile(const std::string& path) {

@@ -16,6 +16,7 @@
 // an error.
 #pragma once
 
+#include <cstddef>
 #include <string>
 
 #include "core/platform/plist/PlistValue.h"
@@ -29,6 +30,16 @@ namespace velmar {
 bool scanSnapshotValue(const PlistValue& root, const std::string& name, const LogItemCallback& callback,
                        std::string& error, LogReadStats* stats = nullptr);
 LogReadResult parseSnapshotValue(const PlistValue& root, const std::string& name);
+
+class LogByteStream;
+
+// The largest snapshot file read: a property list is parsed whole, so its size is bounded instead.
+inline constexpr std::size_t kMaxSnapshotBytes = 32 * 1024 * 1024;
+
+// Reads the property list through stream (at most kMaxSnapshotBytes, else an error: "big.velmar: larger
+// than 32 MiB, more than a snapshot holds"), then streams its items as scanSnapshotValue does.
+bool scanSnapshotStream(LogByteStream& stream, const std::string& name, const LogItemCallback& callback,
+                        std::string& error, LogReadStats* stats = nullptr);
 
 bool forEachSnapshotItem(const std::string& path, const LogItemCallback& callback, std::string& error,
                          LogReadStats* stats = nullptr);

@@ -104,11 +104,21 @@ TEST(DiagStreamDeframer, AnOverlongFrameIsBadAndTheStreamGoesOn) {
     EXPECT_EQ(stats.badFrames, 1U);
     EXPECT_EQ(stats.problems, expectedProblems);
 
-    // Fed whole, the same.
-    const LogReadResult whole = parseDiagCaptureBytes(stream, "port");
-    ASSERT_EQ(whole.items.size(), 1U);
-    EXPECT_EQ(whole.items[0].offset, 300001U);
-    EXPECT_EQ(whole.stats.problems, expectedProblems);
+    // A capture file is no port: there such a frame says the input is no capture (or one that never ends a
+    // frame), and the reading ends with an error instead of going on.
+    std::string error;
+    LogReadStats fileStats;
+    std::size_t blobs = 0;
+    EXPECT_FALSE(scanDiagCaptureBytes(
+        stream, "cap.qmdl",
+        [&blobs](const LogItemView&) {
+            ++blobs;
+            return true;
+        },
+        error, &fileStats));
+    EXPECT_EQ(error, "cap.qmdl: offset 0: frame longer than 262144 bytes");
+    EXPECT_EQ(blobs, 0U);
+    EXPECT_EQ(fileStats.badFrames, 1U);
 }
 
 TEST(DiagStreamDeframer, FinishEndsAnInputAndOffsetsKeepCounting) {
