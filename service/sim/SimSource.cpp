@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "core/platform/BasebandTime.h"
 #include "core/platform/StringFormat.h"
 #include "core/platform/SystemLog.h"
 #include "service/sim/TechnologyEmitter.h"
@@ -9,9 +10,6 @@
 namespace velmar {
 
 namespace {
-
-// 1980-01-06 00:00:00 UTC, the baseband's epoch, in seconds since 1970-01-01.
-constexpr std::int64_t kBasebandEpochUnixSeconds = 315964800;
 
 const char* scenarioName(sim::Scenario scenario) {
     switch (scenario) {
@@ -37,12 +35,7 @@ SimSource::~SimSource() {
 std::uint64_t SimSource::basebandTimestampOf(std::chrono::system_clock::time_point instant) {
     const auto sinceUnixEpoch =
         std::chrono::duration_cast<std::chrono::microseconds>(instant.time_since_epoch()).count();
-    const std::int64_t sinceBasebandEpoch = sinceUnixEpoch - kBasebandEpochUnixSeconds * 1000000;
-    if (sinceBasebandEpoch <= 0) {
-        return 0;
-    }
-    // 1/800 s units: microseconds × 800 / 1e6 = microseconds / 1250.
-    return (static_cast<std::uint64_t>(sinceBasebandEpoch) / 1250) << 16;
+    return basebandTimestampOfUnixMicroseconds(sinceUnixEpoch);
 }
 
 bool SimSource::prepare(std::string& error) {

@@ -1,5 +1,7 @@
 #include "tools/decode/DecodeOptions.h"
 
+#include <charconv>
+#include <cmath>
 #include <string_view>
 
 #include "core/platform/CommandLine.h"
@@ -8,6 +10,17 @@
 namespace velmar {
 
 namespace {
+
+// Seconds as a decimal number ("2", "0.5") in microseconds, within 1 ms and one day.
+std::optional<std::int64_t> parseSeconds(std::string_view text) {
+    double seconds = 0;
+    const auto [end, status] = std::from_chars(text.data(), text.data() + text.size(), seconds);
+    if (status != std::errc() || end != text.data() + text.size() || !(seconds >= 0.001) ||
+        !(seconds <= 86400)) {
+        return std::nullopt;
+    }
+    return static_cast<std::int64_t>(std::llround(seconds * 1e6));
+}
 
 // velmar-decode's command line, its rows writing into options.
 CommandLine decodeCommandLine(DecodeOptions& options) {
@@ -23,9 +36,17 @@ CommandLine decodeCommandLine(DecodeOptions& options) {
             return "";
         },
         .epilogue =
-            "A refresh runs at every 'tick' line of a hex file, after each entry of a snapshot file, and "
+            "A refresh runs at every 'tick' line of a hex file and after each entry of a snapshot file (with "
+            "--every or --csv: at the end of each period of recording time that holds packets instead), and "
             "once after the last blob. Data are shown as {\"$data\": base64}, dates as {\"$date\": "
-            "ISO 8601 UTC}.\nExit status: 0 on success, 2 on a usage error or unreadable input.",
+            "ISO 8601 UTC}. CSV fields are quoted as RFC 4180 says; lines end with LF; with --csv all the "
+            "rows are written at the end, when every column is known.\n"
+            "Files are read through a window of 1 MiB, so memory does not grow with their size: a capture "
+            "frame longer than 262144 bytes, a hex line longer than the window or a snapshot file larger "
+            "than 32 MiB ends the reading with an error. When standard error is a terminal and a file is "
+            "larger than "
+            "50 MB, a progress line there tells the bytes and packets done, the rate and the time left.\n"
+            "Exit status: 0 on success, 2 on a usage error or unreadable input.",
         .wording = {.unknownOption = "unknown option '{}'", .takesNoValue = "option {} takes no value"},
     };
     commandLine.options = {
@@ -76,6 +97,37 @@ CommandLine decodeCommandLine(DecodeOptions& options) {
          .value = "",
          .help = "one JSON line per display refresh instead of one document at the end",
          .apply = setsFlag(options.everyTick)},
+        {.name = "--every",
+         .value = "SECONDS",
+         .help = "refresh the display every SECONDS of recording time (the packets' own timestamps), at the "
+                 "multiples of SECONDS since 1970 UTC, instead of at 'tick' lines and snapshot entries; "
+                 "periods without packets have no refresh",
+         .apply = [&options](std::string_view value) -> std::string {
+             const std::optional<std::int64_t> micro = parseSeconds(value);
+             if (!micro) {
+                 return "--every needs a number of seconds from 0.001 to 86400, not '" + std::string(value) +
+                        "'";
+             }
+             options.everyMicroseconds = *micro;
+             return "";
+         }},
+        {.name = "--csv",
+         .value = "PATH",
+         .help =
+             "print CSV instead of JSON: a 'time' column (ISO 8601 UTC recording time of the refresh) and "
+             "one column per display PATH as the panes show it (e.g. 'Serving Cell/Serving Cell "
+             "Info/Physical Cell ID'), numbers without units, one row per refresh, empty cells where a "
+             "value is absent; repeat for more columns, or 'all' for every numeric leaf. Without --every, "
+             "refreshes every 2 seconds of recording time, the monitor's tick",
+         .apply = [&options](std::string_view value) -> std::string {
+             options.csv = true;
+             if (value != "all") {
+                 options.csvPaths.emplace_back(value);
+             } else {
+                 options.csvAll = true;
+             }
+             return "";
+         }},
         {.name = "--save-contents",
          .value = "",
          .help = "print the snapshot save contents (history entries and DLF file) instead",
@@ -129,6 +181,23 @@ std::optional<DecodeOptions> parseDecodeOptions(const std::vector<std::string>& 
     if (options.technology.empty()) {
         error = "--technology is required (" + technologyNameList(", ", " or ") + ")";
         return std::nullopt;
+    }
+    if (options.csv) {
+        if (options.csvAll && !options.csvPaths.empty()) {
+            error = "--csv all takes no other paths";
+            return std::nullopt;
+        }
+        for (const auto& [set, name] :
+             {std::pair{options.everyTick, "--every-tick"},
+              std::pair{options.saveContents, "--save-contents"}, std::pair{options.census, "--census"}}) {
+            if (set) {
+                error = std::string("--csv does not combine with ") + name;
+                return std::nullopt;
+            }
+        }
+        if (options.everyMicroseconds == 0) {
+            options.everyMicroseconds = kDefaultCsvEvery;
+        }
     }
     if (options.files.empty() && !options.startCommand && !options.listDecoders) {
         error = "no input file given";

@@ -1,6 +1,7 @@
 // DecodeOptions: the command line of velmar-decode.
 #pragma once
 
+#include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -10,6 +11,9 @@
 
 namespace velmar {
 
+// The monitor's display tick: how often --csv refreshes by recording time unless --every says otherwise.
+inline constexpr std::int64_t kDefaultCsvEvery = 2000000;
+
 struct DecodeOptions {
     enum class Output { Display, State };
 
@@ -18,6 +22,12 @@ struct DecodeOptions {
     LogFormat format = LogFormat::Auto;
     Output output = Output::Display;
     bool everyTick = false;
+    // --every: refresh every this many microseconds of recording time instead of at the input's own
+    // refresh points; 0 when not given (--csv then refreshes at kDefaultCsvEvery).
+    std::int64_t everyMicroseconds = 0;
+    bool csv = false;
+    std::vector<std::string> csvPaths;
+    bool csvAll = false;  // "--csv all": every numeric leaf
     bool saveContents = false;
     bool startCommand = false;
     bool listDecoders = false;

@@ -16,8 +16,10 @@
 
 #include "LogGenerator/DecoderMap.h"
 #include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/ORVLogGenerator.h"
 #include "LogGenerator/StateKeys.h"
 #include "core/platform/BasebandPacket.h"
+#include "core/platform/BasebandTime.h"
 #include "core/platform/BuildInfo.h"
 #include "core/platform/CommandLine.h"
 #include "core/platform/Json.h"
@@ -27,7 +29,10 @@
 #include "logfile/LogFormat.h"
 #include "logfile/PacketCensus.h"
 #include "logfile/PacketVersionAdapter.h"
+#include "tools/decode/CsvTimeSeries.h"
 #include "tools/decode/DecodeOptions.h"
+#include "tools/decode/ProgressLine.h"
+#include "tools/decode/RecordingClock.h"
 
 namespace velmar {
 namespace {
@@ -46,6 +51,8 @@ class StandardOutput {
         std::fwrite(text.data(), 1, text.size(), diversion_.stream());
         std::fflush(diversion_.stream());
     }
+
+    std::FILE* stream() { return diversion_.stream(); }
 
     void writeLines(const std::vector<std::string>& lines) {
         for (const std::string& line : lines) {
@@ -168,15 +175,44 @@ int run(const DecodeOptions& options) {
         return 0;
     }
 
+    // Only the state and the save contents show the raw blobs of an interval: without them, a recording of
+    // any length decodes in bounded memory.
+    if (options.output == DecodeOptions::Output::Display && !options.saveContents) {
+        if (auto* binary = dynamic_cast<ORVLogGenerator*>(generator.get())) {
+            binary->setGathersRawBlobs(false);
+        }
+    }
     const StateDict state = PlistDictionary::create();
     auto shownValue = [&]() -> PlistValue {
         return options.output == DecodeOptions::Output::State ? PlistValue(state)
                                                               : state->get(state_keys::kDisplay);
     };
-    auto refresh = [&]() {
+    std::optional<CsvTimeSeries> csv;
+    if (options.csv) {
+        csv.emplace(options.csvPaths, json.stream());
+    }
+    auto refresh = [&](std::optional<std::int64_t> time) {
         generator->generateLogUsingState(state);
-        if (options.everyTick && !options.saveContents) {
+        if (csv) {
+            csv->addRefresh(time, state->get(state_keys::kDisplay));
+        } else if (options.everyTick && !options.saveContents) {
             json.write(shownValue(), 0);
+        }
+    };
+    // With --every (or --csv) refreshes follow the packets' timestamps instead of the input's own ticks.
+    std::optional<RecordingClock> clock;
+    if (options.everyMicroseconds > 0) {
+        clock.emplace(options.everyMicroseconds);
+    }
+    auto advanceClock = [&](ByteView blob) {
+        const BasebandPacket framed = frameBasebandPacket(blob);
+        if (!framed.hasHeader()) {
+            return;
+        }
+        if (const std::optional<std::int64_t> time = unixMicrosecondsOfBasebandTimestamp(framed.timestamp)) {
+            if (const std::optional<std::int64_t> due = clock->refreshBefore(*time)) {
+                refresh(due);
+            }
         }
     };
 
@@ -195,17 +231,24 @@ int run(const DecodeOptions& options) {
     for (const std::string& path : options.files) {
         std::string error;
         LogReadStats stats;
+        ProgressLine progress(stderr, path);
+        std::uint64_t packets = 0;
         const bool read = forEachLogItem(
             path, options.format,
             [&](const LogItemView& item) {
                 if (!item.isTick()) {
+                    progress.update(item.offset, ++packets);
+                    if (clock && !options.census) {
+                        advanceClock(item.bytes);
+                    }
                     intake(item.bytes);
-                } else if (!options.census) {
-                    refresh();
+                } else if (!options.census && !clock) {
+                    refresh(std::nullopt);
                 }
                 return true;
             },
             error, &stats);
+        progress.finish();
         reportCaptureStatistics(path, stats);
         if (!read) {
             return fail(error);
@@ -215,7 +258,11 @@ int run(const DecodeOptions& options) {
         json.writeLines(censusReport(census, codesOfStartCommand(generator->getStartCommand())));
         return 0;
     }
-    refresh();
+    refresh(clock ? clock->currentPeriodEnd() : std::nullopt);
+    if (csv) {
+        csv->finish();
+        return 0;
+    }
 
     if (options.saveContents) {
         json.write(generator->getSaveContentsFromState(state), kPrettyIndent);
