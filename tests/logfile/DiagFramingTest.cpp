@@ -61,6 +61,33 @@ TEST(DiagFraming, TheCrcHasTheStandardCheckValue) {
     EXPECT_EQ(crc16X25(ByteView(reinterpret_cast<const std::uint8_t*>(check.data()), check.size())), 0x906E);
 }
 
+// The CRC bit by bit, as the polynomial defines it, against the table-driven one at every length and
+// alignment, so that the eight-byte steps and the tail agree.
+TEST(DiagFraming, TheCrcAgreesWithTheBitwiseDefinitionAtEveryLengthAndAlignment) {
+    const auto bitwise = [](const std::uint8_t* data, std::size_t size) {
+        unsigned crc = 0xFFFF;
+        for (std::size_t i = 0; i < size; ++i) {
+            crc ^= data[i];
+            for (int bit = 0; bit < 8; ++bit) {
+                crc = (crc & 1U) != 0 ? (crc >> 1) ^ 0x8408U : crc >> 1;
+            }
+        }
+        return static_cast<std::uint16_t>(crc ^ 0xFFFFU);
+    };
+    std::vector<std::uint8_t> bytes(80);
+    unsigned seed = 12345;
+    for (std::uint8_t& byte : bytes) {
+        seed = seed * 1103515245U + 12345U;
+        byte = static_cast<std::uint8_t>(seed >> 16);
+    }
+    for (std::size_t start = 0; start < 8; ++start) {
+        for (std::size_t size = 0; start + size <= bytes.size(); ++size) {
+            EXPECT_EQ(crc16X25(ByteView(bytes.data() + start, size)), bitwise(bytes.data() + start, size))
+                << start << "+" << size;
+        }
+    }
+}
+
 TEST(DiagFraming, EncodesEveryPublishedVectorByteForByte) {
     for (const Vector& vector : kVectors) {
         EXPECT_EQ(framed(vector.payload), vector.wire) << vector.request;
