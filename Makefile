@@ -69,7 +69,7 @@ package: build
 package-check: package
 	lintian --fail-on error,warning --display-info build/package/*.deb
 
-test: test-default package-check test-asan fuzz
+test: format-check test-default package-check test-asan fuzz
 
 bench: build
 	@for program in build/default/bench/bench_*; do [ -x "$$program" ] && "$$program"; done
@@ -97,9 +97,9 @@ demo: deps
 format-check: deps
 	git ls-files -z '*.cpp' '*.h' | xargs -0 clang-format --dry-run -Werror
 
-format:
-	find core LogGenerator logfile tools tests bench fuzz ui service -name '*.cpp' -o -name '*.h' 2>/dev/null \
-	  | xargs clang-format -i
+# Rewrites every tracked source and header in the style of .clang-format.
+format: deps
+	git ls-files -z '*.cpp' '*.h' | xargs -0 clang-format -i
 
 clean:
 	rm -rf build
