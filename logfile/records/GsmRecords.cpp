@@ -163,7 +163,7 @@ PlistData buildCellMonitorEntries(const std::vector<CellMonitorEntry>& entries, 
 
 PlistValue pdpContextDictionary(const PdpContext& context) {
     auto dictionary = PlistDictionary::create();
-    dictionary->set("Context ID", PlistValue::integer(context.contextId));
+    dictionary->set("Context ID", std::to_string(context.contextId));
     dictionary->set("APN", context.apn);
     dictionary->set("PDP Type", context.pdpType);
     dictionary->set("PDP Address", context.address);

@@ -155,7 +155,8 @@ PlistValue cellMonitorEntryDictionary(const CellMonitorEntry& entry);
 PlistData buildCellMonitorEntries(const std::vector<CellMonitorEntry>& entries, std::uint64_t timestamp = 0);
 
 // 0xFF0002: the active PDP contexts, an array of one dictionary per context as the telephony service reports
-// it ("Context ID", "APN", "PDP Type", "PDP Address").
+// it ("Context ID", "APN", "PDP Type", "PDP Address"). Every value is text, the context id in decimal: the
+// panes show text leaves only (a number would read "(unknown)").
 struct PdpContext {
     std::int64_t contextId = 0;
     std::string apn;

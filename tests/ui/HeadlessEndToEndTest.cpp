@@ -589,10 +589,12 @@ TEST_F(HeadlessEndToEndTest, ModemManagerFillsTheSimContextsAndCellMonitorKeys) 
                     seen.insert("tac");
                 } else if (path.ends_with("Serving Cell Info/Freq Band Indicator") && value == "3") {
                     seen.insert("band");
+                } else if (path.ends_with("PDP Context Info/1/Context ID") && value == "1") {
+                    seen.insert("context id");
                 }
             }
         }
-        return seen.size() == 7;
+        return seen.size() == 8;
     };
     ASSERT_TRUE(monitor->waitForOutput(showsAll, 30))
         << "seen: "

@@ -152,12 +152,12 @@ TEST(PDPContextList, ArrayOfContextsReplacesTheRows) {
                                 {.contextId = 5, .apn = "ims", .pdpType = "IPV6", .address = "fe80::1"}}),
         0xFF0002);
     auto first = PlistDictionary::create();
-    first->set("Context ID", PlistValue::integer(1));
+    first->set("Context ID", "1");
     first->set("APN", "internet");
     first->set("PDP Type", "IP");
     first->set("PDP Address", "10.1.2.3");
     auto second = PlistDictionary::create();
-    second->set("Context ID", PlistValue::integer(5));
+    second->set("Context ID", "5");
     second->set("APN", "ims");
     second->set("PDP Type", "IPV6");
     second->set("PDP Address", "fe80::1");

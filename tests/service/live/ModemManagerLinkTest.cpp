@@ -139,7 +139,7 @@ class ModemManagerLinkTest : public ServiceTest {
         const PlistValue contexts = extraRecords(client.blobs(), 2).back();
         ASSERT_TRUE(contexts.isArray());
         ASSERT_EQ(contexts.array()->size(), 1U);
-        EXPECT_EQ(numberAt(contexts.array()->at(0), "Context ID"), 2);
+        EXPECT_EQ(textAt(contexts.array()->at(0), "Context ID"), "2");
         EXPECT_EQ(textAt(contexts.array()->at(0), "APN"), "second.test");
         EXPECT_EQ(textAt(contexts.array()->at(0), "PDP Address"), "10.45.18.1");
         EXPECT_EQ(textAt(contexts.array()->at(0), "Interface"), "wwan2");
@@ -183,12 +183,12 @@ TEST_F(ModemManagerLinkTest, SimFilesBearersAndCellsComeFromTheModemWhichMayGoAn
     ASSERT_EQ(contexts.array()->size(), 2U);
     const PlistValue& first = contexts.array()->at(0);
     const PlistValue& second = contexts.array()->at(1);
-    EXPECT_EQ(numberAt(first, "Context ID"), 0);
+    EXPECT_EQ(textAt(first, "Context ID"), "0");
     EXPECT_EQ(textAt(first, "APN"), "internet.test");
     EXPECT_EQ(textAt(first, "PDP Type"), "IPv4");
     EXPECT_EQ(textAt(first, "PDP Address"), "10.45.17.201");
     EXPECT_EQ(textAt(first, "Interface"), "wwan0");
-    EXPECT_EQ(numberAt(second, "Context ID"), 1);
+    EXPECT_EQ(textAt(second, "Context ID"), "1");
     EXPECT_EQ(textAt(second, "APN"), "ims.test");
     EXPECT_EQ(textAt(second, "PDP Type"), "IPv4v6");
     EXPECT_EQ(textAt(second, "PDP Address"), "10.45.17.202");

@@ -105,7 +105,7 @@ TEST(ModemRecords, AConnectedBearerIsAContextWithItsAddressAndServers) {
     EXPECT_TRUE(problems.empty());
     EXPECT_EQ(xmlOf(bearerContextDictionary(*context)),
               "<dict>\n"
-              "\t<key>Context ID</key>\n\t<integer>7</integer>\n"
+              "\t<key>Context ID</key>\n\t<string>7</string>\n"
               "\t<key>APN</key>\n\t<string>internet.test</string>\n"
               "\t<key>PDP Type</key>\n\t<string>IPv4v6</string>\n"
               "\t<key>PDP Address</key>\n\t<string>10.45.17.201</string>\n"
@@ -139,7 +139,7 @@ TEST(ModemRecords, BearerRecordIsAnArrayOfContexts) {
     first.context = {1, "internet.test", "IPv4", "10.0.0.2"};
     const PlistData record = buildBearerContextsRecord({first});
     EXPECT_EQ(payloadOf(record, 0x0002), ("<array>\n\t<dict>\n"
-                                          "\t\t<key>Context ID</key>\n\t\t<integer>1</integer>\n"
+                                          "\t\t<key>Context ID</key>\n\t\t<string>1</string>\n"
                                           "\t\t<key>APN</key>\n\t\t<string>internet.test</string>\n"
                                           "\t\t<key>PDP Type</key>\n\t\t<string>IPv4</string>\n"
                                           "\t\t<key>PDP Address</key>\n\t\t<string>10.0.0.2</string>\n"
