@@ -24,6 +24,7 @@ class ORVLogGenerator : public LogGenerator {
     // copy of its blobs; the display does not depend on them, the history entries' "DisplayState" and the
     // save contents do (they then hold no blobs).
     void setGathersRawBlobs(bool gathers);
+    bool gathersRawBlobs() const { return _gathersRawBlobs; }
 
     // "Velmar <version>" when the application has a version string, else "(none)".
     static std::string dlfVersionText(const std::optional<std::string>& applicationVersion);

@@ -41,32 +41,12 @@ ORVLogGenerator2::~ORVLogGenerator2() {
 }
 
 void ORVLogGenerator2::updateState(const StateDict& state, ByteView data) {
-    getDisplayFromState(state);
+    if (!displayIsBound(state)) {
+        getDisplayFromState(state);
+    }
     updateWithData(data);
     if (_binData) {
         _binData->insert(_binData->end(), data.begin(), data.end());
-    }
-}
-
-void ORVLogGenerator2::updateWithData(ByteView data) {
-    // The length test is made before the prefix is cut, so a prefixed blob of 13 or 14 bytes passes.
-    if (data.size() < kPacketHeaderLength) {
-        return;
-    }
-    const BasebandPacket framed = frameBasebandPacket(data);
-    const ByteView packet = framed.packet;
-    if (!framed.isPlain() && !framed.isExtended()) {
-        SystemLog::log(kLogError, "Invalid log type: %x. Dropping.", framed.logType);
-        return;
-    }
-    const std::int32_t code = framed.logCode();
-    if (!cIndex) {
-        return;
-    }
-    if (const DecoderList* subscribers = cIndex->getSubscribers(code)) {
-        for (const DecoderRef& decoder : *subscribers) {
-            decoder->updateWithData(packet, code);
-        }
     }
 }
 
@@ -83,7 +63,7 @@ bool ORVLogGenerator2::adoptKeptDisplay(const StateDict& state, const PlistValue
         return false;
     }
     bindSections(display);
-    boundDisplay_ = display.dictionary();
+    bind(display.dictionary());
     return true;
 }
 
@@ -101,6 +81,11 @@ void ORVLogGenerator2::bindSections(const PlistValue& displayValue) {
             bindSections(element);
         }
     }
+}
+
+void ORVLogGenerator2::bind(const PlistDictionaryRef& display) {
+    boundDisplay_ = display;
+    boundRoot_ = display.get();
 }
 
 PlistValue ORVLogGenerator2::getDisplayFromState(const StateDict& state) {
@@ -134,7 +119,7 @@ PlistValue ORVLogGenerator2::getDisplayFromState(const StateDict& state) {
     PlistValue tree = processTemplate(templateValue);
     printDict(tree);
     if (!tree.isNone()) {
-        boundDisplay_ = tree.dictionary();
+        bind(tree.dictionary());
         state->set(state_keys::kDisplay, tree);
         state->set(state_keys::kExtraInfo, PlistValue::newDictionary());
     }

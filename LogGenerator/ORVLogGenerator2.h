@@ -20,6 +20,9 @@
 
 #include "LogGenerator/ClassIndex.h"
 #include "LogGenerator/ORVLogGenerator.h"
+#include "LogGenerator/StateKeys.h"
+#include "core/platform/BasebandPacket.h"
+#include "core/platform/SystemLog.h"
 
 namespace velmar {
 
@@ -28,7 +31,27 @@ class ORVLogGenerator2 : public ORVLogGenerator {
     ~ORVLogGenerator2() override;
 
     void updateState(const StateDict& state, ByteView data) override;
-    void updateWithData(ByteView data);
+    // Inline, with displayIsBound, because it runs once per packet and most packets have no subscriber.
+    void updateWithData(ByteView data) {
+        // The length test is made before the prefix is cut, so a prefixed blob of 13 or 14 bytes passes.
+        if (data.size() < kPacketHeaderLength) {
+            return;
+        }
+        const BasebandPacket framed = frameBasebandPacket(data);
+        if (!framed.isPlain() && !framed.isExtended()) {
+            SystemLog::log(kLogError, "Invalid log type: %x. Dropping.", framed.logType);
+            return;
+        }
+        const std::int32_t code = framed.logCode();
+        if (!cIndex) {
+            return;
+        }
+        if (const DecoderList* subscribers = cIndex->getSubscribers(code)) {
+            for (const DecoderRef& decoder : *subscribers) {
+                decoder->updateWithData(framed.packet, code);
+            }
+        }
+    }
     PlistValue getDisplayFromState(const StateDict& state);
     PlistValue processTemplate(const PlistValue& templateValue);
     void printDict(const PlistValue& displayValue);
@@ -61,8 +84,31 @@ class ORVLogGenerator2 : public ORVLogGenerator {
     static CreationNoted noteCreation(const ClassIndex* classIndex);
     ORVLogGenerator2(CreationNoted, std::string templateName, std::shared_ptr<ClassIndex> classIndex);
 
-    // The display tree the decoders are bound to (not owned: the state owns it).
+    void bind(const PlistDictionaryRef& display);
+    // Whether the state's display is the tree the decoders are bound to, as getDisplayFromState would find
+    // it. A live weak reference and the same address mean the same object, so the check needs no reference
+    // counting; the display's slot in the state is looked up again only when the state gained or lost a key.
+    bool displayIsBound(const StateDict& state) {
+        if (state.get() != displaySlot_.state || state->revision() != displaySlot_.revision ||
+            displaySlot_.stateRef.expired()) {
+            displaySlot_ = {state, state.get(), state->revision(), state->find(state_keys::kDisplay)};
+        }
+        const PlistValue* display = displaySlot_.display;
+        return display != nullptr && boundRoot_ != nullptr && display->dictionary().get() == boundRoot_ &&
+               !boundDisplay_.expired();
+    }
+
+    // The display tree the decoders are bound to (not owned: the state owns it), and its address.
     std::weak_ptr<PlistDictionary> boundDisplay_;
+    const PlistDictionary* boundRoot_ = nullptr;
+    // Where the last state seen keeps its display, as of the state's revision.
+    struct DisplaySlot {
+        std::weak_ptr<PlistDictionary> stateRef;
+        const PlistDictionary* state = nullptr;
+        std::uint64_t revision = 0;
+        const PlistValue* display = nullptr;
+    };
+    DisplaySlot displaySlot_;
 };
 
 }  // namespace velmar

@@ -146,7 +146,7 @@ class InMemoryPath : public DiagFrameSink {
         const DiagFrameContents contents = readDiagFrame(frame.payload);
         if (contents.kind == DiagFrameContents::Kind::LogPacket &&
             subscriptions_.streams(contents.subscription)) {
-            monitors.deliver(frameBasebandBlob(contents.blob));
+            monitors.deliver(frameBasebandBlob(contents.blob()));
         }
         return true;
     }

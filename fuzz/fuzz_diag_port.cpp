@@ -33,7 +33,7 @@ class Device : public live::DiagSession::Listener, public DiagFrameSink {
         session_.heardFromDevice();
         const DiagFrameContents contents = readDiagFrame(frame.payload);
         if (contents.kind == DiagFrameContents::Kind::LogPacket) {
-            delivered_ += subscriptions_.streams(contents.subscription) ? contents.blob.size() : 0;
+            delivered_ += subscriptions_.streams(contents.subscription) ? contents.blob().size() : 0;
         } else if (contents.kind == DiagFrameContents::Kind::Other &&
                    !live::isAsynchronous(contents.packet) &&
                    contents.packet.size() <= live::kMaxDiagResponseBytes) {

@@ -2,10 +2,6 @@
 
 #include <array>
 
-#include "core/platform/BasebandPacket.h"
-#include "core/platform/RecordReader.h"
-#include "logfile/DlfFile.h"
-
 namespace velmar {
 
 namespace {
@@ -33,13 +29,6 @@ constexpr CrcTables makeCrcTables() {
 }
 
 constexpr CrcTables kCrcTables = makeCrcTables();
-
-DiagFrameContents bad(std::string problem) {
-    DiagFrameContents contents;
-    contents.kind = DiagFrameContents::Kind::Bad;
-    contents.problem = std::move(problem);
-    return contents;
-}
 
 }  // namespace
 
@@ -80,59 +69,26 @@ void appendDiagFrame(PlistData& out, std::span<const std::uint8_t> payload) {
     out.push_back(kDiagFrameEnd);
 }
 
-// Every unwrapping step leaves at least one byte, so nothing past the payload is ever looked at.
-DiagFrameContents readDiagFrame(std::span<std::uint8_t> payload) {
-    if (payload.empty()) {
-        return bad("empty frame");
+std::string DiagFrameContents::problemText() const {
+    switch (problem) {
+        case DiagFrameProblem::None:
+            return {};
+        case DiagFrameProblem::Empty:
+            return "empty frame";
+        case DiagFrameProblem::WrappersTooDeep:
+            return "wrappers nested deeper than " + std::to_string(kMaxDiagWrapperDepth) + " levels";
+        case DiagFrameProblem::EmptyWrapper:
+            return "wrapper of " + std::to_string(size) + " bytes holds no frame";
+        case DiagFrameProblem::ShortLogPacket:
+            return "log packet of " + std::to_string(size) + " bytes is too short for a record length";
+        case DiagFrameProblem::ShortRecord:
+            return "record length " + std::to_string(size) + " is shorter than the " +
+                   std::to_string(kDlfHeaderSize) + "-byte header";
+        case DiagFrameProblem::LongRecord:
+            return "record length " + std::to_string(size) + " runs past the end of the " +
+                   std::to_string(packetSize) + "-byte log packet";
     }
-    DiagFrameContents contents;
-    std::size_t first = 0;
-    const std::size_t length = payload.size();
-    int depth = 0;
-    while (payload[first] == kDiagWrapper) {
-        if (length - first < 2 || payload[first + 1] != 0x01) {
-            break;  // a wrapper version this reader does not know: an "other" frame
-        }
-        if (depth == kMaxDiagWrapperDepth) {
-            return bad("wrappers nested deeper than " + std::to_string(kMaxDiagWrapperDepth) + " levels");
-        }
-        if (length - first <= kDiagWrapperHeaderSize) {
-            return bad("wrapper of " + std::to_string(length - first) + " bytes holds no frame");
-        }
-        if (depth == 0) {
-            contents.subscription = RecordReader(payload.subspan(first)).u32(4);
-        }
-        first += kDiagWrapperHeaderSize;
-        ++depth;
-    }
-    contents.packet = payload.subspan(first);
-    const std::span<std::uint8_t> packet = contents.packet;
-    if (packet[0] != kDiagLogPacket) {
-        contents.kind = DiagFrameContents::Kind::Other;
-        return contents;
-    }
-    const auto damaged = [&contents](std::string problem) {
-        contents.kind = DiagFrameContents::Kind::Bad;
-        contents.problem = std::move(problem);
-        return contents;
-    };
-    if (packet.size() < 6) {
-        return damaged("log packet of " + std::to_string(packet.size()) +
-                       " bytes is too short for a record length");
-    }
-    const std::size_t recordLength = RecordReader(packet).u16(4);
-    if (recordLength < kDlfHeaderSize) {
-        return damaged("record length " + std::to_string(recordLength) + " is shorter than the " +
-                       std::to_string(kDlfHeaderSize) + "-byte header");
-    }
-    if (4 + recordLength > packet.size()) {
-        return damaged("record length " + std::to_string(recordLength) + " runs past the end of the " +
-                       std::to_string(packet.size()) + "-byte log packet");
-    }
-    packet[3] = kPlainLogType;
-    contents.kind = DiagFrameContents::Kind::LogPacket;
-    contents.blob = ByteView(packet.data() + 3, 1 + recordLength);
-    return contents;
+    return {};
 }
 
 }  // namespace velmar

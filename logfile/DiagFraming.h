@@ -19,8 +19,11 @@
 #include <span>
 #include <string>
 
+#include "core/platform/BasebandPacket.h"
 #include "core/platform/ByteView.h"
+#include "core/platform/RecordReader.h"
 #include "core/platform/plist/PlistValue.h"
+#include "logfile/DlfFile.h"
 
 namespace velmar {
 
@@ -39,7 +42,18 @@ std::uint16_t crc16X25(std::span<const std::uint8_t> bytes);
 // Appends payload as the port sends it: CRC appended, 0x7E and 0x7D escaped, 0x7E at the end.
 void appendDiagFrame(PlistData& out, std::span<const std::uint8_t> payload);
 
-// What one checked frame holds (its payload: CRC removed, escapes undone).
+enum class DiagFrameProblem : std::uint8_t {
+    None,
+    Empty,
+    WrappersTooDeep,
+    EmptyWrapper,    // size: the wrapper's bytes
+    ShortLogPacket,  // size: the packet's bytes
+    ShortRecord,     // size: the record length
+    LongRecord,      // size: the record length; packetSize: the packet's bytes
+};
+
+// What one checked frame holds (its payload: CRC removed, escapes undone). Plain data: reading a frame
+// allocates nothing, and a damaged one is described only when its text is asked for.
 struct DiagFrameContents {
     enum class Kind : std::uint8_t { LogPacket, Other, Bad };
 
@@ -48,14 +62,87 @@ struct DiagFrameContents {
     std::optional<std::uint32_t> subscription;
     // The frame inside its wrappers (the whole payload when unwrapped); never empty unless Bad.
     std::span<std::uint8_t> packet;
-    // LogPacket: the blob (0x01 followed by the DLF record), inside packet.
-    ByteView blob;
+    // LogPacket: the DLF record's length, read from the packet.
+    std::size_t recordLength = 0;
+    // Bad: what is wrong, and the sizes its description names.
+    DiagFrameProblem problem = DiagFrameProblem::None;
+    std::size_t size = 0;
+    std::size_t packetSize = 0;
+
     // Bad: why, for a message.
-    std::string problem;
+    std::string problemText() const;
+    // LogPacket: the blob (0x01 followed by the DLF record), inside packet. Derived rather than stored, so
+    // that handing it on reads two registers' worth of fields apart, not a pair just written.
+    ByteView blob() const { return ByteView(packet.data() + 3, 1 + recordLength); }
 };
 
 // Reads a checked payload of at least one byte. For a log packet the byte before the record (the high byte
 // of the packet's first length) is overwritten with the blob's type byte 0x01, so the blob needs no copy.
-DiagFrameContents readDiagFrame(std::span<std::uint8_t> payload);
+// Inline, because it runs once per frame and its caller reads the result at once: one result object, kept
+// in registers, makes no trip through memory. Every unwrapping step leaves at least one byte, so nothing
+// past the payload is ever looked at. A damaged wrapper says nothing of a subscription or packet; a damaged
+// log packet keeps what its wrappers said.
+[[gnu::always_inline]] inline DiagFrameContents readDiagFrame(std::span<std::uint8_t> payload) {
+    DiagFrameContents contents;
+    const auto damaged = [&contents](DiagFrameProblem problem, std::size_t size = 0,
+                                     std::size_t packetSize = 0) {
+        contents.kind = DiagFrameContents::Kind::Bad;
+        contents.problem = problem;
+        contents.size = size;
+        contents.packetSize = packetSize;
+    };
+    const auto damagedWrapper = [&contents, &damaged](DiagFrameProblem problem, std::size_t size = 0) {
+        contents.subscription.reset();
+        damaged(problem, size);
+    };
+    if (payload.empty()) {
+        damaged(DiagFrameProblem::Empty);
+        return contents;
+    }
+    std::size_t first = 0;
+    const std::size_t length = payload.size();
+    int depth = 0;
+    while (payload[first] == kDiagWrapper) {
+        if (length - first < 2 || payload[first + 1] != 0x01) {
+            break;  // a wrapper version this reader does not know: an "other" frame
+        }
+        if (depth == kMaxDiagWrapperDepth) {
+            damagedWrapper(DiagFrameProblem::WrappersTooDeep);
+            return contents;
+        }
+        if (length - first <= kDiagWrapperHeaderSize) {
+            damagedWrapper(DiagFrameProblem::EmptyWrapper, length - first);
+            return contents;
+        }
+        if (depth == 0) {
+            contents.subscription = RecordReader(payload.subspan(first)).u32(4);
+        }
+        first += kDiagWrapperHeaderSize;
+        ++depth;
+    }
+    contents.packet = payload.subspan(first);
+    const std::span<std::uint8_t> packet = contents.packet;
+    if (packet[0] != kDiagLogPacket) {
+        contents.kind = DiagFrameContents::Kind::Other;
+        return contents;
+    }
+    if (packet.size() < 6) {
+        damaged(DiagFrameProblem::ShortLogPacket, packet.size());
+        return contents;
+    }
+    const std::size_t recordLength = RecordReader(packet).u16(4);
+    if (recordLength < kDlfHeaderSize) {
+        damaged(DiagFrameProblem::ShortRecord, recordLength);
+        return contents;
+    }
+    if (4 + recordLength > packet.size()) {
+        damaged(DiagFrameProblem::LongRecord, recordLength, packet.size());
+        return contents;
+    }
+    packet[3] = kPlainLogType;
+    contents.kind = DiagFrameContents::Kind::LogPacket;
+    contents.recordLength = recordLength;
+    return contents;
+}
 
 }  // namespace velmar

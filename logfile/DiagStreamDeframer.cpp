@@ -165,7 +165,7 @@ void DiagStreamDeframer::handle(std::uint64_t offset, std::span<const std::uint8
     }
     switch (contents.kind) {
         case DiagFrameContents::Kind::Bad:
-            bad(offset, contents.problem);
+            bad(offset, contents.problemText());
             return;
         case DiagFrameContents::Kind::Other:
             ++stats_->otherFrames;
@@ -176,7 +176,7 @@ void DiagStreamDeframer::handle(std::uint64_t offset, std::span<const std::uint8
     ++stats_->logPackets;
     ++stats_->blobs;
     LogItemView item;
-    item.bytes = contents.blob;
+    item.bytes = contents.blob();
     item.offset = offset;
     if (!callback_(item)) {
         stopped_ = true;

@@ -19,6 +19,7 @@
 #include <cstdint>
 
 #include "core/platform/ByteView.h"
+#include "core/platform/RecordReader.h"
 
 namespace velmar {
 
@@ -52,9 +53,35 @@ struct BasebandPacket {
     std::int32_t logCode() const { return isExtended() ? kExtendedCodeBase + code : code; }
 };
 
-BasebandPacket frameBasebandPacket(ByteView blob);
-
 // The blob without its channel prefix, when it has one.
-ByteView withoutChannelPrefix(ByteView blob);
+inline ByteView withoutChannelPrefix(ByteView blob) {
+    if (blob.size() >= kChannelPrefixLength && blob[0] == kChannelPrefixMarker) {
+        return blob.subspan(kChannelPrefixLength);
+    }
+    return blob;
+}
+
+// The header fields of packet, the blob without its channel prefix: the one reading of a header.
+inline BasebandPacket readBasebandHeader(ByteView blob, ByteView packet) {
+    BasebandPacket framed;
+    framed.packet = packet;
+    framed.prefixLength = blob.size() - packet.size();
+    const RecordReader reader(packet);
+    framed.logType = reader.byteAt(0);
+    framed.recordLength = static_cast<std::uint16_t>(reader.u16(kPacketRecordLengthOffset));
+    framed.code = static_cast<std::uint16_t>(reader.u16(kPacketCodeOffset));
+    framed.timestamp = reader.unsignedLE(kPacketTimestampOffset, 8);
+    return framed;
+}
+
+// Out of line: a packet shorter than a whole header is rare.
+BasebandPacket frameShortBasebandPacket(ByteView blob);
+
+// Inline for a packet with a whole header, because it runs once per packet and its result is read at once.
+inline BasebandPacket frameBasebandPacket(ByteView blob) {
+    const ByteView packet = withoutChannelPrefix(blob);
+    return packet.size() < kPacketHeaderLength ? frameShortBasebandPacket(blob)
+                                               : readBasebandHeader(blob, packet);
+}
 
 }  // namespace velmar

@@ -3,10 +3,13 @@
 // Contract: iteration yields entries in first-insertion order; assigning to an existing key keeps its place;
 // removing a key closes the gap. Lookups accept any string_view without building a std::string. Small maps
 // are searched linearly; from kIndexThreshold entries on a hash index is kept beside the entries, so lookups
-// stay constant-time for large dictionaries (templates, path dictionaries, subscriber tables).
+// stay constant-time for large dictionaries (templates, path dictionaries, subscriber tables). revision()
+// changes whenever a key is added or removed, so a caller that keeps pointers to values knows when to drop
+// them.
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -21,8 +24,31 @@ class InsertionOrderedMap {
     using Entry = std::pair<std::string, Value>;
     static constexpr std::size_t kIndexThreshold = 12;
 
+    InsertionOrderedMap() = default;
+    InsertionOrderedMap(const InsertionOrderedMap&) = default;
+    InsertionOrderedMap(InsertionOrderedMap&&) noexcept = default;
+    // Assigning replaces every entry: the revision moves on, whatever the other map's says.
+    InsertionOrderedMap& operator=(const InsertionOrderedMap& other) {
+        if (this != &other) {
+            entries_ = other.entries_;
+            index_ = other.index_;
+            ++revision_;
+        }
+        return *this;
+    }
+    InsertionOrderedMap& operator=(InsertionOrderedMap&& other) noexcept {
+        if (this != &other) {
+            entries_ = std::move(other.entries_);
+            index_ = std::move(other.index_);
+            ++revision_;
+            ++other.revision_;
+        }
+        return *this;
+    }
+
     std::size_t size() const { return entries_.size(); }
     bool empty() const { return entries_.empty(); }
+    std::uint64_t revision() const { return revision_; }
 
     const Value* find(std::string_view key) const {
         const std::size_t at = indexOf(key);
@@ -42,6 +68,7 @@ class InsertionOrderedMap {
             return entries_[at].second;
         }
         entries_.emplace_back(std::string(key), std::move(value));
+        ++revision_;
         if (!index_.empty()) {
             index_.emplace(entries_.back().first, entries_.size() - 1);
         } else if (entries_.size() >= kIndexThreshold) {
@@ -64,6 +91,7 @@ class InsertionOrderedMap {
             return false;
         }
         entries_.erase(entries_.begin() + static_cast<std::ptrdiff_t>(at));
+        ++revision_;
         if (!index_.empty()) {
             rebuildIndex();
         }
@@ -73,9 +101,13 @@ class InsertionOrderedMap {
     void clear() {
         entries_.clear();
         index_.clear();
+        ++revision_;
     }
 
-    void reserve(std::size_t count) { entries_.reserve(count); }
+    void reserve(std::size_t count) {
+        entries_.reserve(count);
+        ++revision_;  // the values may have moved
+    }
 
     const std::vector<Entry>& entries() const { return entries_; }
     auto begin() const { return entries_.begin(); }
@@ -114,6 +146,7 @@ class InsertionOrderedMap {
     }
 
     std::vector<Entry> entries_;
+    std::uint64_t revision_ = 0;
     std::unordered_map<std::string, std::size_t, TransparentHash, std::equal_to<>> index_;
 };
 

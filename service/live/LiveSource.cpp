@@ -191,7 +191,7 @@ bool LiveSource::onDiagFrame(const DiagFrameView& frame) {
     switch (contents.kind) {
         case DiagFrameContents::Kind::LogPacket:
             if (subscriptions_.streams(contents.subscription)) {
-                deliverLogPacket(contents.blob);
+                deliverLogPacket(contents.blob());
             }
             break;
         case DiagFrameContents::Kind::Other:
@@ -208,7 +208,7 @@ bool LiveSource::onDiagFrame(const DiagFrameView& frame) {
             }
             break;
         case DiagFrameContents::Kind::Bad:
-            deframer_.bad(frame.offset, contents.problem);
+            deframer_.bad(frame.offset, contents.problemText());
             break;
     }
     return true;

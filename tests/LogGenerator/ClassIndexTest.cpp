@@ -30,6 +30,32 @@ TEST(ClassIndex, SubscribersAreFoundByDecimalTextOfTheCode) {
     EXPECT_EQ(index.getSubscribers(45434), nullptr);
 }
 
+// A class index that takes decoders after it was built, as the tests' and fuzzers' indexes do.
+class GrowingClassIndex : public RecordingClassIndex {
+  public:
+    using RecordingClassIndex::RecordingClassIndex;
+    void add(const std::string& section, std::vector<std::int32_t> codes) {
+        auto decoder = std::make_shared<testing::RecordingDecoder>(section, std::move(codes));
+        classDict.set(decoder->getSectionName(), decoder);
+        decoder->updateLogCodeDict(codeDictionary);
+    }
+};
+
+TEST(ClassIndex, ACodeSubscribedAfterLookupsIsFoundAndOldCodesStayFound) {
+    GrowingClassIndex index({{"A", std::vector<std::int32_t>{0xB179}}});
+    EXPECT_EQ(sectionsOf(index.getSubscribers(0xB179)), std::vector<std::string>{"A"});
+    EXPECT_EQ(index.getSubscribers(0xB17A), nullptr);
+    // 0x1B179 shares the low 16 bits of 0xB179: the quick test lets it by, the exact one turns it away.
+    EXPECT_EQ(index.getSubscribers(0x1B179), nullptr);
+    index.add("B", {0xB17A, 0xFF0001});
+    index.add("C", {0xB179});
+    EXPECT_EQ(sectionsOf(index.getSubscribers(0xB17A)), std::vector<std::string>{"B"});
+    EXPECT_EQ(sectionsOf(index.getSubscribers(0xFF0001)), std::vector<std::string>{"B"});
+    EXPECT_EQ(sectionsOf(index.getSubscribers(0xB179)), (std::vector<std::string>{"A", "C"}));
+    EXPECT_EQ(index.getSubscribers(0x0001), nullptr);
+    EXPECT_EQ(index.subscribedCodes(), (std::vector<std::int32_t>{0xB179, 0xB17A, 0xFF0001}));
+}
+
 TEST(ClassIndex, DecodersSharingACodeAreCalledInCreationOrder) {
     RecordingClassIndex index({{"First", std::vector<std::int32_t>{7, 9}},
                                {"Second", std::vector<std::int32_t>{9}},

@@ -130,6 +130,39 @@ TEST_F(TemplateDisplayTest, ANewGeneratorWritesIntoTheDisplayKeptInTheState) {
     EXPECT_EQ(second.generateLogUsingState(state).dictionary(), keptDisplay);
 }
 
+TEST_F(TemplateDisplayTest, ADisplayPutInPlaceOfTheBoundOneBetweenPacketsIsWrittenTo) {
+    // The generator remembers where the state keeps its display; a new tree stored under the same key (the
+    // state gains no key) must still be noticed, and the decoders bound to it.
+    RecordingGenerator generator("Test", {{"Serving", std::vector<std::int32_t>{1}}});
+    generator.updateState(state, packet(1));
+    const PlistDictionaryRef first = state->get(kDisplay).dictionary();
+    ASSERT_TRUE(first);
+    StateDict other = PlistDictionary::create();
+    {
+        RecordingGenerator builder("Test", {{"Serving", std::vector<std::int32_t>{1}}});
+        builder.generateLogUsingState(other);
+    }
+    const PlistDictionaryRef replacement = other->get(kDisplay).dictionary();
+    ASSERT_TRUE(replacement);
+    state->set(kDisplay, replacement);
+    std::vector<std::uint8_t> longer = packet(1);
+    longer.resize(41);
+    generator.updateState(state, longer);
+    const auto servingOf = [](const PlistDictionaryRef& display) {
+        return display->get("Radio").dictionary()->get("Serving").dictionary();
+    };
+    EXPECT_EQ(*servingOf(replacement)->get("Length").string(), "41");
+    EXPECT_EQ(*servingOf(first)->get("Length").string(), "20");
+
+    // A display removed from the state is built again at the next packet.
+    state->remove(kDisplay);
+    generator.updateState(state, packet(1));
+    const PlistDictionaryRef rebuilt = state->get(kDisplay).dictionary();
+    ASSERT_TRUE(rebuilt);
+    EXPECT_NE(rebuilt, replacement);
+    EXPECT_EQ(*servingOf(rebuilt)->get("Length").string(), "20");
+}
+
 TEST_F(TemplateDisplayTest, ADisplayBuiltFromAnotherTemplateGivesWayToTheNewGeneratorsOwn) {
     testing::writeWholeFile(resources_.file("Other.plist"), R"(<?xml version="1.0" encoding="UTF-8"?>
 <plist version="1.0"><dict><key>Other</key><dict><key>Serving</key><dict/></dict></dict></plist>

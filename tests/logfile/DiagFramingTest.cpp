@@ -134,7 +134,7 @@ TEST(DiagFraming, ReadsTheSubscriptionOfAWrappedLogPacket) {
     ASSERT_EQ(contents.kind, DiagFrameContents::Kind::LogPacket);
     ASSERT_TRUE(contents.subscription.has_value());
     EXPECT_EQ(*contents.subscription, 2U);
-    EXPECT_EQ(Bytes(contents.blob.begin(), contents.blob.end()),
+    EXPECT_EQ(Bytes(contents.blob().begin(), contents.blob().end()),
               (Bytes{0x01, 0x0C, 0x00, 0x16, 0x41, 1, 2, 3, 4, 5, 6, 7, 8}));
     EXPECT_EQ(contents.packet.size(), 16U);
 }
@@ -163,14 +163,24 @@ TEST(DiagFraming, DamagedContentsAreBadWithAReason) {
         Bytes payload = testCase.payload;
         const DiagFrameContents contents = readDiagFrame(payload);
         EXPECT_EQ(contents.kind, DiagFrameContents::Kind::Bad);
-        EXPECT_EQ(contents.problem, testCase.problem);
+        EXPECT_EQ(contents.problemText(), testCase.problem);
     }
     Bytes deep;
     for (int level = 0; level < 5; ++level) {
         deep.insert(deep.end(), {0x98, 0x01, 0x00, 0x00, 0x01, 0x00, 0x00, 0x00});
     }
     deep.push_back(0x60);
-    EXPECT_EQ(readDiagFrame(deep).problem, "wrappers nested deeper than 4 levels");
+    EXPECT_EQ(readDiagFrame(deep).problemText(), "wrappers nested deeper than 4 levels");
+    // A damaged wrapper tells no subscription; a damaged log packet keeps what its wrapper told.
+    EXPECT_FALSE(readDiagFrame(deep).subscription.has_value());
+    Bytes emptyWrapper = cases[0].payload;
+    EXPECT_FALSE(readDiagFrame(emptyWrapper).subscription.has_value());
+    Bytes wrappedShort = {0x98, 0x01, 0x00, 0x00, 0x05, 0x00, 0x00, 0x00, 0x10, 0x00, 0x0C};
+    const DiagFrameContents shortPacket = readDiagFrame(wrappedShort);
+    EXPECT_EQ(shortPacket.kind, DiagFrameContents::Kind::Bad);
+    EXPECT_EQ(shortPacket.subscription, 5U);
+    EXPECT_EQ(shortPacket.packet.size(), 3U);
+    EXPECT_EQ(shortPacket.problemText(), "log packet of 3 bytes is too short for a record length");
 }
 
 }  // namespace

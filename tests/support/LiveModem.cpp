@@ -21,7 +21,7 @@ class BlobCollector : public DiagFrameSink {
         const DiagFrameContents contents = readDiagFrame(frame.payload);
         if (contents.kind == DiagFrameContents::Kind::LogPacket &&
             (!subscription_ || !contents.subscription || *contents.subscription == *subscription_)) {
-            blobs.emplace_back(contents.blob.begin(), contents.blob.end());
+            blobs.emplace_back(contents.blob().begin(), contents.blob().end());
         }
         return true;
     }

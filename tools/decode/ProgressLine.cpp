@@ -47,10 +47,7 @@ ProgressLine::ProgressLine(std::FILE* out, const std::string& path) : out_(out) 
     start_ = lastDraw_ = monotonicSeconds();
 }
 
-void ProgressLine::update(std::uint64_t bytesDone, std::uint64_t packets) {
-    if (!enabled_ || ++sinceLook_ < kPacketsPerClockLook) {
-        return;
-    }
+void ProgressLine::look(std::uint64_t bytesDone, std::uint64_t packets) {
     sinceLook_ = 0;
     const double now = monotonicSeconds();
     if (now - lastDraw_ < kRedrawSeconds) {

@@ -18,6 +18,7 @@
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/ORVLogGenerator.h"
 #include "LogGenerator/StateKeys.h"
+#include "LogGenerator/SubscribedCodes.h"
 #include "core/platform/BasebandPacket.h"
 #include "core/platform/BasebandTime.h"
 #include "core/platform/BuildInfo.h"
@@ -216,13 +217,22 @@ int run(const DecodeOptions& options) {
         }
     };
 
-    // Every blob passes the packet-version adapter on its way to the generator, as in the service.
+    // Every blob passes the packet-version adapter on its way to the generator, as in the service. After the
+    // first, packets of codes that no decoder reads skip both, as a live modem would not send them.
     PacketVersionAdapter adapter;
     PacketCensus census;
+    const std::optional<SubscribedCodes> subscribed = SubscribedCodes::of(*generator);
+    bool generatorHasSeenAPacket = false;
     auto intake = [&](ByteView blob) {
         if (options.census) {
             census.add(adapter.adapt(blob));
-        } else if (options.rawVersions) {
+            return;
+        }
+        if (subscribed && generatorHasSeenAPacket && !subscribed->passes(blob)) {
+            return;
+        }
+        generatorHasSeenAPacket = true;
+        if (options.rawVersions) {
             generator->updateState(state, blob);
         } else {
             generator->updateState(state, adapter.adapt(blob).blob);

@@ -5,8 +5,6 @@
 namespace velmar {
 
 namespace {
-const PlistDictionaryRef kNoDictionary;
-const PlistArrayRef kNoArray;
 const PlistDataRef kNoData;
 }  // namespace
 
@@ -59,14 +57,6 @@ PlistValue PlistValue::newArray() {
     return PlistValue(PlistArray::create());
 }
 
-const PlistDictionaryRef& PlistValue::dictionary() const {
-    const auto* held = std::get_if<PlistDictionaryRef>(&value_);
-    return held ? *held : kNoDictionary;
-}
-const PlistArrayRef& PlistValue::array() const {
-    const auto* held = std::get_if<PlistArrayRef>(&value_);
-    return held ? *held : kNoArray;
-}
 const std::string* PlistValue::string() const {
     return std::get_if<std::string>(&value_);
 }

@@ -67,8 +67,15 @@ class PlistValue {
     bool isDate() const { return kind() == Kind::Date; }
 
     // Accessors answer null / nullopt when the value is of another kind.
-    const PlistDictionaryRef& dictionary() const;
-    const PlistArrayRef& array() const;
+    // Inline: the decoders and the display ask these once per record.
+    const PlistDictionaryRef& dictionary() const {
+        const auto* held = std::get_if<PlistDictionaryRef>(&value_);
+        return held ? *held : kNoDictionary;
+    }
+    const PlistArrayRef& array() const {
+        const auto* held = std::get_if<PlistArrayRef>(&value_);
+        return held ? *held : kNoArray;
+    }
     const std::string* string() const;
     std::optional<std::int64_t> integerValue() const;
     std::optional<double> realValue() const;
@@ -90,6 +97,10 @@ class PlistValue {
     bool operator==(const PlistValue& other) const;
 
   private:
+    // What dictionary() and array() answer for a value of another kind.
+    static inline const PlistDictionaryRef kNoDictionary{};
+    static inline const PlistArrayRef kNoArray{};
+
     std::variant<std::monostate, PlistDictionaryRef, PlistArrayRef, std::string, std::int64_t, double, bool,
                  PlistDataRef, PlistDate>
         value_;
@@ -104,6 +115,9 @@ class PlistDictionary {
 
     std::size_t size() const { return map_.size(); }
     bool empty() const { return map_.empty(); }
+    // Changes whenever a key is added or removed (or storage reserved): until it does, a pointer that find()
+    // answered stays valid and keeps showing the key's current value.
+    std::uint64_t revision() const { return map_.revision(); }
     // The stored value, or null when the key is absent.
     const PlistValue* find(std::string_view key) const { return map_.find(key); }
     // The stored value, or a none value when the key is absent. The reference stays valid until the
